@@ -1,0 +1,14 @@
+// Entry point of every test executable. The process code pages are pinned to Western European
+// (1252 / 437) so that results do not depend on the machine's locale; tests that need another
+// code page set it themselves and restore it.
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+
+int main(int argc, char** argv) {
+  setenv("TAVLO_PLATFORM_ACP", "1252", 0);
+  setenv("TAVLO_PLATFORM_OEMCP", "437", 0);
+  testing::InitGoogleTest(&argc, argv);
+  return RUN_ALL_TESTS();
+}
