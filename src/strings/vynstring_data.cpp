@@ -37,15 +37,20 @@ void ClearEdges(char* chars, std::size_t charBytes) noexcept {
   std::memset(chars + charBytes, 0, kFormSpareBytes);
 }
 
-// The spin lock of one block. Held only around the walk and extension of the form chain.
+// The spin lock of one block. Held only around the walk and extension of the form chain. A
+// block with a single reference is reachable from the calling thread alone and needs no lock.
 class BlockLock {
  public:
-  explicit BlockLock(VynStringData* data) noexcept : m_data(data) {
+  explicit BlockLock(VynStringData* data) noexcept
+      : m_data(data->refs.load(std::memory_order_acquire) == 1 ? nullptr : data) {
+    if (!m_data) return;
     while (m_data->lock.exchange(kStringLockHeld, std::memory_order_acquire) != 0) {
       win32::SwitchToThread();
     }
   }
-  ~BlockLock() { m_data->lock.store(0, std::memory_order_release); }
+  ~BlockLock() {
+    if (m_data) m_data->lock.store(0, std::memory_order_release);
+  }
   BlockLock(const BlockLock&) = delete;
   BlockLock& operator=(const BlockLock&) = delete;
 

@@ -100,8 +100,8 @@ TEST(VynString, FormsFromEveryPrimaryEncodingAgree) {
   }
   EXPECT_EQ(fromUtf8, fromUtf16);
   EXPECT_EQ(fromUtf16, fromUtf32);
-  // Windows-1252 holds all but the emoji, which becomes the default character.
-  EXPECT_EQ(BytesOf(fromUtf8.ToCP(1252)), "A\xE9\x80?z");
+  // Windows-1252 holds all but the emoji, whose two UTF-16 units each become the default character.
+  EXPECT_EQ(BytesOf(fromUtf8.ToCP(1252)), "A\xE9\x80??z");
 }
 
 TEST(VynString, CodePageTagsAreNormalisedOnEntry) {

@@ -9,6 +9,7 @@
 // Impossible allocation requests must come back as null from malloc, as they do without
 // AddressSanitizer, so that the library's own out-of-memory handling can be tested.
 extern "C" const char* __asan_default_options() { return "allocator_may_return_null=1"; }
+extern "C" const char* __tsan_default_options() { return "allocator_may_return_null=1"; }
 
 int main(int argc, char** argv) {
   setenv("TAVLO_PLATFORM_ACP", "1252", 0);

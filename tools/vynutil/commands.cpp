@@ -1,0 +1,14 @@
+// The table of the tool's subcommands.
+
+#include "command.h"
+
+namespace vyntool {
+
+std::span<const Command> Commands() {
+  static constexpr Command kCommands[] = {
+      {"convert", "convert text from one code page to another", RunConvert},
+  };
+  return kCommands;
+}
+
+}  // namespace vyntool
