@@ -62,8 +62,13 @@ VYN_API BOOL GetCPInfo(UINT CodePage, CPINFO* lpCPInfo);
 VYN_API UINT GetACP();
 VYN_API UINT GetOEMCP();
 // Pins the process code pages (0 returns that one to the locale or environment default).
-// Hosts and tests use it to run as, say, a Japanese (932) process.
+// Hosts and tests use it to run as, say, a Japanese (932) process. A value that is not a code
+// page this layer converts (a pseudo code page, CP_UTF16, ...) counts as 0.
 VYN_API void SetProcessCodePages(UINT acp, UINT oemcp);
+// The environment and the locale are read once, at the first need; this forgets that reading so
+// the next call reads them again (for hosts that set TAVLO_PLATFORM_ACP after start-up, and
+// tests). Pinned code pages stay pinned.
+VYN_API void ReloadProcessCodePages();
 
 // Locales: the thread locale (default: the process's user locale) and the locale data the
 // code-page normalisation asks for.

@@ -1,0 +1,25 @@
+#pragma once
+// Vectorised ASCII runs, the common case of every conversion: bytes below 0x80 widen to the same
+// UTF-16 units and back. AVX2 is used when the processor has it (chosen once at start-up; the
+// environment variable VYN_FORCE_SSE2 set to 1 keeps the SSE2 versions, for testing).
+
+#include <cstddef>
+
+namespace win32::detail {
+
+// Widens the ASCII prefix of s[0, n) into out and returns its length. Works in whole blocks:
+// out must have room for n units, and units after the prefix may be overwritten.
+std::size_t WidenAsciiPrefix(const unsigned char* s, std::size_t n, char16_t* out) noexcept;
+
+// Narrows the ASCII prefix (units below 0x80) of s[0, n) into out and returns its length. out must
+// have room for n bytes, and bytes after the prefix may be overwritten.
+std::size_t NarrowAsciiPrefix(const char16_t* s, std::size_t n, char* out) noexcept;
+
+// The length of the ASCII prefix of s[0, n), without writing anything.
+std::size_t AsciiPrefixLength(const unsigned char* s, std::size_t n) noexcept;
+std::size_t Utf16AsciiPrefixLength(const char16_t* s, std::size_t n) noexcept;
+
+// True when the AVX2 versions are in use.
+bool UsingAvx2() noexcept;
+
+}  // namespace win32::detail
