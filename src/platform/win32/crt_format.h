@@ -46,9 +46,4 @@ VYN_API int _vsnwprintf_s(MCHAR* buffer, std::size_t size, std::size_t count, co
 VYN_API int _vsnwprintf_s_l(MCHAR* buffer, std::size_t size, std::size_t count, const MCHAR* format,
                             _locale_t locale, va_list args);
 
-// The standard C behaviour on Windows' engine: output that does not fit is cut, the terminator is
-// written when size > 0, and the full length is returned (-1 for an invalid format).
-VYN_API int vsnprintf(char* buffer, std::size_t size, const char* format, va_list args);
-VYN_API int vswprintf(MCHAR* buffer, std::size_t size, const MCHAR* format, va_list args);
-
 }  // namespace win32
