@@ -10,6 +10,7 @@
 #include "strings/string_errors.h"
 #include "vynutil/char_convert.h"
 #include "win32/codepage.h"
+#include "win32/crt_string.h"
 #include "win32/process.h"
 
 namespace VynSDK::Util::StringBlocks {
@@ -163,16 +164,28 @@ EncodedForm* MakeUtf16(const ChainScan& scan) {
   ThrowNoConvertibleForm();
 }
 
+// UTF-8 takes up to three bytes a unit. Short text is converted on the stack and copied into a
+// form of its exact size; long text is measured first, so no form is ever made three times too big.
+EncodedForm* MakeUtf8(const MCHAR* src, std::size_t n) {
+  constexpr std::size_t kStackUnits = 512;
+  if (n <= kStackUnits) {
+    char buffer[3 * kStackUnits + 1];
+    std::size_t written = win32::text::Utf16ToUtf8(src, n, buffer);
+    EncodedForm* form = NewForm(CP_UTF8, written + 1);
+    std::memcpy(form->Chars(), buffer, written);
+    form->Chars()[written] = 0;
+    return form;
+  }
+  std::size_t bytes = win32::text::Utf16ToUtf8Length(src, n);
+  EncodedForm* form = NewForm(CP_UTF8, bytes + 1);
+  win32::text::Utf16ToUtf8(src, n, form->Chars());
+  form->Chars()[bytes] = 0;
+  return form;
+}
+
 EncodedForm* MakeFromUtf16(const EncodedForm* utf16, UINT encoding) {
   auto* src = reinterpret_cast<const MCHAR*>(utf16->Chars());
-  if (encoding == CP_UTF8) {
-    std::size_t n = UnitLength(src, sizeof(MCHAR));
-    std::size_t bytes = UnitsToBytes(n, 3) + 1;
-    EncodedForm* form = NewForm(CP_UTF8, bytes);
-    std::size_t written = win32::text::Utf16ToUtf8(src, n, form->Chars());
-    form->Chars()[written] = 0;
-    return ShrinkForm(form, written + 1, bytes);
-  }
+  if (encoding == CP_UTF8) return MakeUtf8(src, UnitLength(src, sizeof(MCHAR)));
   if (encoding == CP_UTF32) {
     std::size_t units = WideCharToUTF32(src, VYN_STRING_TO_TERMINATOR, nullptr, 0);
     std::size_t bytes = UnitsToBytes(units, sizeof(unsigned int));
@@ -223,12 +236,7 @@ std::size_t UnitSize(UINT encoding) noexcept {
 
 std::size_t UnitLength(const void* chars, std::size_t unitSize) noexcept {
   switch (unitSize) {
-    case 2: {
-      auto* p = static_cast<const MCHAR*>(chars);
-      const MCHAR* q = p;
-      while (*q) ++q;
-      return static_cast<std::size_t>(q - p);
-    }
+    case 2: return win32::wcslen(static_cast<const MCHAR*>(chars));
     case 4: {
       auto* p = static_cast<const unsigned int*>(chars);
       const unsigned int* q = p;
