@@ -29,8 +29,8 @@ const char* const kSamples[] = {
     "\u65e5\u672c\u8a9e\u306e\u6587\u7ae0\u306f\u3001\u3072\u3089\u304c\u306a\u3068\u30ab\u30bf"
     "\u30ab\u30ca\u3068\u6f22\u5b57\u3067\u66f8\u304b\u308c\u3066\u3044\u307e\u3059\u3002\u4e2d"
     "\u6587\u6587\u672c\u4e5f\u5f88\u5e38\u89c1\u3002",
-    "\U0001F600\U0001F603 \U0001F44D\U0001F3FD\U0001F389\U0001F38A ok \U0001F680\U0001F30D\u2764"
-    "\U0001F525 \U0001F431\U0001F436",
+    ("\U0001F600\U0001F603 \U0001F44D\U0001F3FD\U0001F389\U0001F38A ok \U0001F680\U0001F30D\u2764"
+     "\U0001F525 \U0001F431\U0001F436"),
 };
 
 // UTF-8 text of the kind, cut at a character boundary at or below `size` bytes.
@@ -132,10 +132,9 @@ void Utf16ToUtf8_VynWin32(benchmark::State& state, Case c) {
   const std::u16string in = ToUtf16(utf8);
   std::string out(in.size() * 3, '\0');
   for (auto _ : state) {
-    benchmark::DoNotOptimize(win32::WideCharToMultiByte(CP_UTF8, 0, in.data(),
-                                                        static_cast<int>(in.size()), out.data(),
-                                                        static_cast<int>(out.size()), nullptr,
-                                                        nullptr));
+    benchmark::DoNotOptimize(
+        win32::WideCharToMultiByte(CP_UTF8, 0, in.data(), static_cast<int>(in.size()), out.data(),
+                                   static_cast<int>(out.size()), nullptr, nullptr));
     benchmark::ClobberMemory();
   }
   state.SetBytesProcessed(state.iterations() * utf8.size());
@@ -241,10 +240,9 @@ void Utf16ToSingleByte_Vyn(benchmark::State& state, SingleByteCase c) {
   }();
   std::string out(in.size(), '\0');
   for (auto _ : state) {
-    benchmark::DoNotOptimize(win32::WideCharToMultiByte(c.codePage, 0, in.data(),
-                                                        static_cast<int>(in.size()), out.data(),
-                                                        static_cast<int>(out.size()), nullptr,
-                                                        nullptr));
+    benchmark::DoNotOptimize(
+        win32::WideCharToMultiByte(c.codePage, 0, in.data(), static_cast<int>(in.size()),
+                                   out.data(), static_cast<int>(out.size()), nullptr, nullptr));
     benchmark::ClobberMemory();
   }
   state.SetBytesProcessed(state.iterations() * in.size());

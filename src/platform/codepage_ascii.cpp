@@ -46,10 +46,10 @@ std::size_t AsciiLengthSse2(const unsigned char* s, std::size_t n) noexcept {
 inline unsigned AsciiUnitMaskSse2(__m128i v0, __m128i v1) {
   const __m128i high = _mm_set1_epi16(static_cast<short>(0xFF80));
   const __m128i zero = _mm_setzero_si128();
-  const unsigned m0 = static_cast<unsigned>(
-      _mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
-  const unsigned m1 = static_cast<unsigned>(
-      _mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
+  const unsigned m0 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
+  const unsigned m1 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
   return m0 | (m1 << 16);
 }
 
@@ -113,8 +113,8 @@ VYN_TARGET_AVX2 std::size_t AsciiLengthAvx2(const unsigned char* s, std::size_t 
 // Bit 2k and 2k+1 set for every unit k of v (16 units) that is below 0x80.
 VYN_TARGET_AVX2 inline unsigned AsciiUnitMaskAvx2(__m256i v) {
   const __m256i high = _mm256_set1_epi16(static_cast<short>(0xFF80));
-  return static_cast<unsigned>(_mm256_movemask_epi8(
-      _mm256_cmpeq_epi16(_mm256_and_si256(v, high), _mm256_setzero_si256())));
+  return static_cast<unsigned>(
+      _mm256_movemask_epi8(_mm256_cmpeq_epi16(_mm256_and_si256(v, high), _mm256_setzero_si256())));
 }
 
 VYN_TARGET_AVX2 std::size_t NarrowAvx2(const char16_t* s, std::size_t n, char* out) noexcept {
@@ -157,24 +157,28 @@ struct AsciiKernels {
   std::size_t (*narrow)(const char16_t*, std::size_t, char*) noexcept;
   std::size_t (*length)(const unsigned char*, std::size_t) noexcept;
   std::size_t (*utf16Length)(const char16_t*, std::size_t) noexcept;
-  bool avx2;
 };
 
-AsciiKernels ChooseKernels() noexcept {
+// The SSE2 kernels from the start (constant-initialised, so conversions during other static
+// initialisers work), replaced by the AVX2 ones while the library loads when the processor has
+// AVX2.
+constinit AsciiKernels g_kernels = {WidenSse2, NarrowSse2, AsciiLengthSse2, Utf16AsciiLengthSse2};
+
+[[maybe_unused]] const bool g_kernelsChosen = [] {
   const char* force = std::getenv("VYN_FORCE_SSE2");
   const bool sse2Only = force != nullptr && force[0] == '1';
   if (!sse2Only && __builtin_cpu_supports("avx2")) {
-    return {WidenAvx2, NarrowAvx2, AsciiLengthAvx2, Utf16AsciiLengthAvx2, true};
+    g_kernels = {WidenAvx2, NarrowAvx2, AsciiLengthAvx2, Utf16AsciiLengthAvx2};
+    g_usingAvx2 = true;
   }
-  return {WidenSse2, NarrowSse2, AsciiLengthSse2, Utf16AsciiLengthSse2, false};
-}
+  return true;
+}();
 
-const AsciiKernels& Kernels() noexcept {
-  static const AsciiKernels kernels = ChooseKernels();
-  return kernels;
-}
+const AsciiKernels& Kernels() noexcept { return g_kernels; }
 
 }  // namespace
+
+constinit bool g_usingAvx2 = false;
 
 std::size_t WidenAsciiPrefix(const unsigned char* s, std::size_t n, char16_t* out) noexcept {
   return Kernels().widen(s, n, out);
@@ -191,7 +195,5 @@ std::size_t AsciiPrefixLength(const unsigned char* s, std::size_t n) noexcept {
 std::size_t Utf16AsciiPrefixLength(const char16_t* s, std::size_t n) noexcept {
   return Kernels().utf16Length(s, n);
 }
-
-bool UsingAvx2() noexcept { return Kernels().avx2; }
 
 }  // namespace win32::detail

@@ -19,7 +19,8 @@ std::size_t NarrowAsciiPrefix(const char16_t* s, std::size_t n, char* out) noexc
 std::size_t AsciiPrefixLength(const unsigned char* s, std::size_t n) noexcept;
 std::size_t Utf16AsciiPrefixLength(const char16_t* s, std::size_t n) noexcept;
 
-// True when the AVX2 versions are in use.
-bool UsingAvx2() noexcept;
+// True when the AVX2 versions are in use (set while the library loads).
+extern bool g_usingAvx2;
+inline bool UsingAvx2() noexcept { return g_usingAvx2; }
 
 }  // namespace win32::detail

@@ -14,7 +14,7 @@ std::unique_ptr<Codec> MakeCodec(const CodePageEntry& entry) {
   switch (entry.kind) {
     case CodePageKind::kSingleByte:
     case CodePageKind::kDoubleByte: return MakeTableCodec(entry);
-    case CodePageKind::kUtf8: return MakeUtf8Codec();
+    case CodePageKind::kUtf8: return nullptr;  // converted without a codec
     case CodePageKind::kStateful: return MakeStatefulCodec(entry);
   }
   return nullptr;

@@ -13,7 +13,7 @@ namespace win32::detail {
 
 enum class ConvStatus : std::uint8_t {
   kOk,
-  kInvalid,         // invalid input met in strict mode (MB_ERR_INVALID_CHARS, WC_ERR_INVALID_CHARS)
+  kInvalid,         // invalid input in strict mode (MB_ERR_INVALID_CHARS, WC_ERR_INVALID_CHARS)
   kBufferTooSmall,  // the output did not fit into the capacity given
 };
 
@@ -24,8 +24,7 @@ struct ConvResult {
 
 // What WideCharToMultiByte passes on to a codec.
 struct EncodeOptions {
-  bool strict = false;      // WC_ERR_INVALID_CHARS: fail on lone surrogates (UTF-8 only)
-  bool noBestFit = false;   // WC_NO_BEST_FIT_CHARS: only characters that round-trip
+  bool noBestFit = false;             // WC_NO_BEST_FIT_CHARS: only characters that round-trip
   const char* defaultChar = nullptr;  // lpDefaultChar, or null for the code page's own
   bool* usedDefault = nullptr;        // set when the default character was written
 };
@@ -48,11 +47,17 @@ class Codec {
   virtual bool CanEncode(char16_t c, bool noBestFit) const = 0;
 };
 
-// The codec of the entry, built at first use (thread-safe); null when ICU lacks the converter.
+// The codec of a table or stateful entry, built at first use (thread-safe); null when ICU lacks
+// the converter. UTF-8 has no codec: it is converted by the two functions below.
 const Codec* GetCodec(const CodePageEntry& entry);
 
+// CP_UTF8 with Win32's buffer rules (capacity 0 measures).
+ConvResult DecodeUtf8Bounded(const char* s, std::size_t n, bool strict, char16_t* out,
+                             std::size_t capacity);
+ConvResult EncodeUtf8Bounded(const char16_t* s, std::size_t n, bool strict, char* out,
+                             std::size_t capacity);
+
 // The codec makers GetCodec chooses from by the entry's kind (null when ICU lacks the data).
-std::unique_ptr<Codec> MakeUtf8Codec();
 std::unique_ptr<Codec> MakeTableCodec(const CodePageEntry& entry);
 std::unique_ptr<Codec> MakeStatefulCodec(const CodePageEntry& entry);
 

@@ -13,9 +13,8 @@ ConvResult Decompose(const char16_t* s, std::size_t n, char16_t* out, std::size_
   UErrorCode error = U_ZERO_ERROR;
   const UNormalizer2* nfd = unorm2_getNFDInstance(&error);
   if (U_FAILURE(error)) return {0, ConvStatus::kInvalid};
-  const int32_t count =
-      unorm2_normalize(nfd, s, static_cast<int32_t>(n), capacity ? out : nullptr,
-                       static_cast<int32_t>(capacity), &error);
+  const int32_t count = unorm2_normalize(nfd, s, static_cast<int32_t>(n), capacity ? out : nullptr,
+                                         static_cast<int32_t>(capacity), &error);
   if (error == U_BUFFER_OVERFLOW_ERROR) {
     return capacity == 0 ? ConvResult{static_cast<std::size_t>(count), ConvStatus::kOk}
                          : ConvResult{0, ConvStatus::kBufferTooSmall};
@@ -24,8 +23,8 @@ ConvResult Decompose(const char16_t* s, std::size_t n, char16_t* out, std::size_
   return {static_cast<std::size_t>(count), ConvStatus::kOk};
 }
 
-std::u16string ComposeForCodePage(const char16_t* s, std::size_t n, const Codec& codec,
-                                  DWORD flags, bool noBestFit) {
+std::u16string ComposeForCodePage(const char16_t* s, std::size_t n, const Codec& codec, DWORD flags,
+                                  bool noBestFit) {
   UErrorCode error = U_ZERO_ERROR;
   const UNormalizer2* nfc = unorm2_getNFCInstance(&error);
   std::u16string text;

@@ -18,7 +18,7 @@ ConvResult Decompose(const char16_t* s, std::size_t n, char16_t* out, std::size_
 // replaced by the precomposed character when the codec converts it; otherwise WC_DISCARDNS drops
 // the mark, WC_DEFAULTCHAR replaces the pair by U+FFFF (which becomes the default character),
 // and WC_SEPCHARS (the default) keeps both.
-std::u16string ComposeForCodePage(const char16_t* s, std::size_t n, const Codec& codec,
-                                  DWORD flags, bool noBestFit);
+std::u16string ComposeForCodePage(const char16_t* s, std::size_t n, const Codec& codec, DWORD flags,
+                                  bool noBestFit);
 
 }  // namespace win32::detail

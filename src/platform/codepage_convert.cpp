@@ -73,6 +73,30 @@ bool DecodeFlagsValid(const CodePageEntry& entry, DWORD flags) {
   return (flags & (MB_PRECOMPOSED | MB_COMPOSITE)) != (MB_PRECOMPOSED | MB_COMPOSITE);
 }
 
+// The error for flags, default character and used-default report the code page does not take,
+// or 0.
+DWORD EncodeArgumentsError(const CodePageEntry& entry, DWORD flags, const char* defaultChar,
+                           const BOOL* usedDefault) {
+  switch (entry.kind) {
+    case CodePageKind::kUtf8:
+      if (defaultChar != nullptr || usedDefault != nullptr) return ERROR_INVALID_PARAMETER;
+      return (flags & ~WC_ERR_INVALID_CHARS) ? ERROR_INVALID_FLAGS : 0;
+    case CodePageKind::kStateful:
+      // Windows converts to these code pages only without flags and without the used-default
+      // report (and, for UTF-7, without a default character).
+      if (usedDefault != nullptr || (entry.codePage == CP_UTF7 && defaultChar != nullptr)) {
+        return ERROR_INVALID_PARAMETER;
+      }
+      return flags != 0 ? ERROR_INVALID_FLAGS : 0;
+    default: {
+      // WC_ERR_INVALID_CHARS is for UTF-8 only.
+      constexpr DWORD kKnown =
+          WC_COMPOSITECHECK | WC_DISCARDNS | WC_SEPCHARS | WC_DEFAULTCHAR | WC_NO_BEST_FIT_CHARS;
+      return (flags & ~kKnown) ? ERROR_INVALID_FLAGS : 0;
+    }
+  }
+}
+
 // Decodes to a temporary text, then decomposes it into the caller's buffer.
 ConvResult DecodeComposite(const detail::Codec& codec, const char* s, std::size_t n, bool strict,
                            bool glyphs, MCHAR* out, std::size_t capacity) {
@@ -101,14 +125,17 @@ int MultiByteToWideChar(UINT CodePage, DWORD dwFlags, const char* lpMultiByteStr
   const CodePageEntry* entry = detail::LookUpCodePage(CodePage);
   if (entry == nullptr) return Fail(ERROR_INVALID_PARAMETER);
   if (!DecodeFlagsValid(*entry, dwFlags)) return Fail(ERROR_INVALID_FLAGS);
+  const bool strict = (dwFlags & MB_ERR_INVALID_CHARS) != 0;
+  if (entry->kind == CodePageKind::kUtf8) {  // the common case, without the codec
+    return Finish(detail::DecodeUtf8Bounded(lpMultiByteStr, n, strict, lpWideCharStr, capacity));
+  }
   const detail::Codec* codec = detail::GetCodec(*entry);
   if (codec == nullptr) return Fail(ERROR_INVALID_PARAMETER);
 
-  const bool strict = (dwFlags & MB_ERR_INVALID_CHARS) != 0;
   const bool glyphs = (dwFlags & MB_USEGLYPHCHARS) != 0;
   if (dwFlags & MB_COMPOSITE) {
-    return Finish(DecodeComposite(*codec, lpMultiByteStr, n, strict, glyphs, lpWideCharStr,
-                                  capacity));
+    return Finish(
+        DecodeComposite(*codec, lpMultiByteStr, n, strict, glyphs, lpWideCharStr, capacity));
   }
   return Finish(codec->Decode(lpMultiByteStr, n, strict, glyphs, lpWideCharStr, capacity));
 }
@@ -120,42 +147,26 @@ int WideCharToMultiByte(UINT CodePage, DWORD dwFlags, const MCHAR* lpWideCharStr
       (cbMultiByte > 0 && lpMultiByteStr == nullptr)) {
     return Fail(ERROR_INVALID_PARAMETER);
   }
-  const std::size_t n = cchWideChar == -1 ? Utf16Length(lpWideCharStr) + 1
-                                          : static_cast<std::size_t>(cchWideChar);
+  const std::size_t n =
+      cchWideChar == -1 ? Utf16Length(lpWideCharStr) + 1 : static_cast<std::size_t>(cchWideChar);
   const auto capacity = static_cast<std::size_t>(cbMultiByte);
   if (capacity > 0 && Overlap(lpWideCharStr, n * sizeof(MCHAR), lpMultiByteStr, capacity)) {
     return Fail(ERROR_INVALID_PARAMETER);
   }
   const CodePageEntry* entry = detail::LookUpCodePage(CodePage);
   if (entry == nullptr) return Fail(ERROR_INVALID_PARAMETER);
-  switch (entry->kind) {
-    case CodePageKind::kUtf8:
-      if (lpDefaultChar != nullptr || lpUsedDefaultChar != nullptr) {
-        return Fail(ERROR_INVALID_PARAMETER);
-      }
-      if (dwFlags & ~WC_ERR_INVALID_CHARS) return Fail(ERROR_INVALID_FLAGS);
-      break;
-    case CodePageKind::kStateful:
-      // Windows converts to these code pages only without flags and without the used-default
-      // report (and, for UTF-7, without a default character).
-      if (lpUsedDefaultChar != nullptr || (entry->codePage == CP_UTF7 && lpDefaultChar != nullptr)) {
-        return Fail(ERROR_INVALID_PARAMETER);
-      }
-      if (dwFlags != 0) return Fail(ERROR_INVALID_FLAGS);
-      break;
-    default: {
-      constexpr DWORD kKnown =
-          WC_COMPOSITECHECK | WC_DISCARDNS | WC_SEPCHARS | WC_DEFAULTCHAR | WC_NO_BEST_FIT_CHARS;
-      if (dwFlags & ~kKnown) return Fail(ERROR_INVALID_FLAGS);
-      break;
-    }
+  if (const DWORD error = EncodeArgumentsError(*entry, dwFlags, lpDefaultChar, lpUsedDefaultChar)) {
+    return Fail(error);
+  }
+  if (entry->kind == CodePageKind::kUtf8) {  // the common case, without the codec
+    return Finish(detail::EncodeUtf8Bounded(lpWideCharStr, n, (dwFlags & WC_ERR_INVALID_CHARS) != 0,
+                                            lpMultiByteStr, capacity));
   }
   const detail::Codec* codec = detail::GetCodec(*entry);
   if (codec == nullptr) return Fail(ERROR_INVALID_PARAMETER);
 
   bool used = false;
   detail::EncodeOptions options;
-  options.strict = (dwFlags & WC_ERR_INVALID_CHARS) != 0;
   options.noBestFit = (dwFlags & WC_NO_BEST_FIT_CHARS) != 0;
   options.defaultChar = lpDefaultChar;
   options.usedDefault = lpUsedDefaultChar != nullptr ? &used : nullptr;

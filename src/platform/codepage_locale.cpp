@@ -29,29 +29,29 @@ struct LanguageCodePages {
 
 // Locales whose code pages differ from their language's row below.
 constexpr LanguageCodePages kByLangId[] = {
-    {0x0409, {1252, 437, 10000}},    // English (United States)
-    {0x0404, {950, 950, 10002}},     // Chinese (Taiwan)
-    {0x0C04, {950, 950, 10002}},     // Chinese (Hong Kong)
-    {0x1404, {950, 950, 10002}},     // Chinese (Macao)
-    {0x7C04, {950, 950, 10002}},     // Chinese (Traditional)
-    {0x0804, {936, 936, 10008}},     // Chinese (PRC)
-    {0x1004, {936, 936, 10008}},     // Chinese (Singapore)
-    {0x0004, {936, 936, 10008}},     // Chinese (Simplified)
-    {0x041A, {1250, 852, 10082}},    // Croatian
-    {0x101A, {1250, 852, 10082}},    // Croatian (Bosnia and Herzegovina)
-    {0x141A, {1250, 852, 10082}},    // Bosnian (Latin)
-    {0x201A, {1251, 855, 10007}},    // Bosnian (Cyrillic)
-    {0x081A, {1250, 852, 10029}},    // Serbian (Latin, Serbia and Montenegro)
-    {0x181A, {1250, 852, 10029}},    // Serbian (Latin, Bosnia and Herzegovina)
-    {0x241A, {1250, 852, 10029}},    // Serbian (Latin, Serbia)
-    {0x2C1A, {1250, 852, 10029}},    // Serbian (Latin, Montenegro)
-    {0x0C1A, {1251, 855, 10007}},    // Serbian (Cyrillic, Serbia and Montenegro)
-    {0x1C1A, {1251, 855, 10007}},    // Serbian (Cyrillic, Bosnia and Herzegovina)
-    {0x281A, {1251, 855, 10007}},    // Serbian (Cyrillic, Serbia)
-    {0x301A, {1251, 855, 10007}},    // Serbian (Cyrillic, Montenegro)
-    {0x7C1A, {1251, 855, 10007}},    // Serbian
-    {0x082C, {1251, 866, 10007}},    // Azerbaijani (Cyrillic)
-    {0x0843, {1251, 866, 10007}},    // Uzbek (Cyrillic)
+    {0x0409, {1252, 437, 10000}},  // English (United States)
+    {0x0404, {950, 950, 10002}},   // Chinese (Taiwan)
+    {0x0C04, {950, 950, 10002}},   // Chinese (Hong Kong)
+    {0x1404, {950, 950, 10002}},   // Chinese (Macao)
+    {0x7C04, {950, 950, 10002}},   // Chinese (Traditional)
+    {0x0804, {936, 936, 10008}},   // Chinese (PRC)
+    {0x1004, {936, 936, 10008}},   // Chinese (Singapore)
+    {0x0004, {936, 936, 10008}},   // Chinese (Simplified)
+    {0x041A, {1250, 852, 10082}},  // Croatian
+    {0x101A, {1250, 852, 10082}},  // Croatian (Bosnia and Herzegovina)
+    {0x141A, {1250, 852, 10082}},  // Bosnian (Latin)
+    {0x201A, {1251, 855, 10007}},  // Bosnian (Cyrillic)
+    {0x081A, {1250, 852, 10029}},  // Serbian (Latin, Serbia and Montenegro)
+    {0x181A, {1250, 852, 10029}},  // Serbian (Latin, Bosnia and Herzegovina)
+    {0x241A, {1250, 852, 10029}},  // Serbian (Latin, Serbia)
+    {0x2C1A, {1250, 852, 10029}},  // Serbian (Latin, Montenegro)
+    {0x0C1A, {1251, 855, 10007}},  // Serbian (Cyrillic, Serbia and Montenegro)
+    {0x1C1A, {1251, 855, 10007}},  // Serbian (Cyrillic, Bosnia and Herzegovina)
+    {0x281A, {1251, 855, 10007}},  // Serbian (Cyrillic, Serbia)
+    {0x301A, {1251, 855, 10007}},  // Serbian (Cyrillic, Montenegro)
+    {0x7C1A, {1251, 855, 10007}},  // Serbian
+    {0x082C, {1251, 866, 10007}},  // Azerbaijani (Cyrillic)
+    {0x0843, {1251, 866, 10007}},  // Uzbek (Cyrillic)
 };
 
 constexpr LanguageCodePages kByLanguage[] = {
@@ -186,9 +186,7 @@ constexpr DWORD kLocaleUseCpAcp = 0x40000000;
 thread_local LCID t_threadLocale = 0;  // 0: not set, the user's locale
 }  // namespace
 
-LCID GetThreadLocale() {
-  return t_threadLocale != 0 ? t_threadLocale : GetUserDefaultLCID();
-}
+LCID GetThreadLocale() { return t_threadLocale != 0 ? t_threadLocale : GetUserDefaultLCID(); }
 
 BOOL SetThreadLocale(LCID locale) {
   if (locale == LOCALE_USER_DEFAULT || locale == LOCALE_SYSTEM_DEFAULT) {

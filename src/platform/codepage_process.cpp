@@ -28,15 +28,15 @@ struct CharsetCodePage {
 
 // The Windows ANSI code page of a locale's character set.
 constexpr CharsetCodePage kCharsets[] = {
-    {"UTF8", CP_UTF8},       {"ANSIX3.41968", 1252}, {"ASCII", 1252},    {"USASCII", 1252},
-    {"ISO88591", 1252},      {"ISO885915", 1252},    {"CP1252", 1252},   {"ISO88592", 1250},
-    {"CP1250", 1250},        {"ISO88595", 1251},     {"KOI8R", 1251},    {"KOI8U", 1251},
-    {"CP1251", 1251},        {"ISO88597", 1253},     {"ISO88599", 1254}, {"ISO88598", 1255},
-    {"ISO88596", 1256},      {"ISO88594", 1257},     {"ISO885913", 1257}, {"TIS620", 874},
-    {"ISO885911", 874},      {"CP1258", 1258},       {"TCVN57121", 1258}, {"EUCJP", 932},
-    {"SHIFTJIS", 932},       {"SJIS", 932},          {"GB2312", 936},    {"GBK", 936},
-    {"GB18030", 936},        {"EUCCN", 936},         {"EUCKR", 949},     {"BIG5", 950},
-    {"BIG5HKSCS", 950},      {"EUCTW", 950},
+    {"UTF8", CP_UTF8},  {"ANSIX3.41968", 1252}, {"ASCII", 1252},     {"USASCII", 1252},
+    {"ISO88591", 1252}, {"ISO885915", 1252},    {"CP1252", 1252},    {"ISO88592", 1250},
+    {"CP1250", 1250},   {"ISO88595", 1251},     {"KOI8R", 1251},     {"KOI8U", 1251},
+    {"CP1251", 1251},   {"ISO88597", 1253},     {"ISO88599", 1254},  {"ISO88598", 1255},
+    {"ISO88596", 1256}, {"ISO88594", 1257},     {"ISO885913", 1257}, {"TIS620", 874},
+    {"ISO885911", 874}, {"CP1258", 1258},       {"TCVN57121", 1258}, {"EUCJP", 932},
+    {"SHIFTJIS", 932},  {"SJIS", 932},          {"GB2312", 936},     {"GBK", 936},
+    {"GB18030", 936},   {"EUCCN", 936},         {"EUCKR", 949},      {"BIG5", 950},
+    {"BIG5HKSCS", 950}, {"EUCTW", 950},
 };
 
 // The OEM code page Windows pairs with an ANSI code page.
@@ -45,9 +45,9 @@ struct AnsiOem {
   UINT oem;
 };
 constexpr AnsiOem kOemOfAnsi[] = {
-    {874, 874},   {932, 932},   {936, 936},   {949, 949},   {950, 950},   {1250, 852},
-    {1251, 866},  {1252, 437},  {1253, 737},  {1254, 857},  {1255, 862},  {1256, 720},
-    {1257, 775},  {1258, 1258}, {CP_UTF8, CP_UTF8},
+    {874, 874},  {932, 932},  {936, 936},  {949, 949},   {950, 950},
+    {1250, 852}, {1251, 866}, {1252, 437}, {1253, 737},  {1254, 857},
+    {1255, 862}, {1256, 720}, {1257, 775}, {1258, 1258}, {CP_UTF8, CP_UTF8},
 };
 
 constexpr UINT kFallbackAcp = 1252;
@@ -55,7 +55,8 @@ constexpr UINT kFallbackAcp = 1252;
 UINT CodePageOfCharset(const char* charset) {
   std::string key;
   for (const char* p = charset; *p != '\0'; ++p) {
-    if (*p != '-' && *p != '_') key.push_back(static_cast<char>(std::toupper(static_cast<unsigned char>(*p))));
+    if (*p != '-' && *p != '_')
+      key.push_back(static_cast<char>(std::toupper(static_cast<unsigned char>(*p))));
   }
   for (const CharsetCodePage& entry : kCharsets) {
     if (key == entry.charset) return entry.codePage;
@@ -96,7 +97,8 @@ UINT AcpFromLocale() {
 
 UINT OemOfAnsi(UINT acp, LCID userLocale) {
   detail::LocaleCodePages pages;
-  if (detail::CodePagesOfLocale(userLocale, &pages) && pages.ansi == acp && pages.oem > CP_THREAD_ACP) {
+  if (detail::CodePagesOfLocale(userLocale, &pages) && pages.ansi == acp &&
+      pages.oem > CP_THREAD_ACP) {
     return pages.oem;  // the locale's own pairing (850 for German, 437 for US English)
   }
   for (const AnsiOem& pair : kOemOfAnsi) {

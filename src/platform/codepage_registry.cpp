@@ -153,15 +153,34 @@ static_assert(std::is_sorted(kEntries.begin(), kEntries.end(),
                                return a.codePage < b.codePage;
                              }));
 
+// Every conversion looks its code page up: an open-addressing hash table over the entries
+// (slot values are entry index + 1, 0 for empty).
+constexpr std::size_t kHashSlots = 128;
+
+constexpr std::size_t HashSlot(UINT codePage) {
+  return static_cast<std::size_t>((codePage * 2654435761u) >> 25) & (kHashSlots - 1);
+}
+
+constexpr std::array<std::uint8_t, kHashSlots> MakeHashTable() {
+  std::array<std::uint8_t, kHashSlots> table{};
+  for (std::size_t i = 0; i < kEntryCount; ++i) {
+    std::size_t slot = HashSlot(kEntries[i].codePage);
+    while (table[slot] != 0) slot = (slot + 1) & (kHashSlots - 1);
+    table[slot] = static_cast<std::uint8_t>(i + 1);
+  }
+  return table;
+}
+
+constexpr auto kHashTable = MakeHashTable();
+
 }  // namespace
 
-std::span<const CodePageEntry> AllCodePages() noexcept { return kEntries; }
-
 const CodePageEntry* FindCodePage(UINT codePage) noexcept {
-  auto it = std::lower_bound(
-      kEntries.begin(), kEntries.end(), codePage,
-      [](const CodePageEntry& e, UINT cp) { return e.codePage < cp; });
-  return it != kEntries.end() && it->codePage == codePage ? &*it : nullptr;
+  for (std::size_t slot = HashSlot(codePage);; slot = (slot + 1) & (kHashSlots - 1)) {
+    const std::uint8_t index = kHashTable[slot];
+    if (index == 0) return nullptr;
+    if (kEntries[index - 1].codePage == codePage) return &kEntries[index - 1];
+  }
 }
 
 UINT ResolvePseudoCodePage(UINT codePage) noexcept {

@@ -28,16 +28,13 @@ struct CodePageEntry {
   UINT codePage;
   CodePageKind kind;
   const char* icuName;
-  std::uint8_t maxCharSize;  // GetCPInfo's MaxCharSize
-  bool oemGlyphs;            // MB_USEGLYPHCHARS maps the control bytes to the DOS glyphs
-  char16_t unicodeDefault;   // what an undefined double-byte character converts to
+  std::uint8_t maxCharSize;    // GetCPInfo's MaxCharSize
+  bool oemGlyphs;              // MB_USEGLYPHCHARS maps the control bytes to the DOS glyphs
+  char16_t unicodeDefault;     // what an undefined double-byte character converts to
   std::uint8_t leadRanges[6];  // inclusive lead-byte ranges as pairs, ended by a zero pair
   std::span<const ByteOverride> overrides;
   std::uint8_t slot;  // index of this entry, for the per-code-page caches
 };
-
-// All entries, sorted by code page number.
-std::span<const CodePageEntry> AllCodePages() noexcept;
 
 // The entry of a real code page number (no pseudo code pages), or null when the platform does
 // not convert it.

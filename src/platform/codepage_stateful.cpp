@@ -64,14 +64,21 @@ class StatefulCodec final : public Codec {
                     std::size_t capacity) const override {
     UConverter* cnv = ThreadConverter(entry_);
     if (cnv == nullptr) return {0, ConvStatus::kInvalid};
-    return BySegments(s, n, out, capacity, [cnv](const char* part, std::size_t length,
-                                                 char16_t* to, std::size_t room) {
-      UErrorCode error = U_ZERO_ERROR;
-      ucnv_resetToUnicode(cnv);
-      const int32_t count = ucnv_toUChars(cnv, room ? to : nullptr, static_cast<int32_t>(room),
-                                          part, static_cast<int32_t>(length), &error);
-      return FromIcu(count, error, room);
-    });
+    const ConvResult r = BySegments(
+        s, n, out, capacity,
+        [cnv](const char* part, std::size_t length, char16_t* to, std::size_t room) {
+          UErrorCode error = U_ZERO_ERROR;
+          ucnv_resetToUnicode(cnv);
+          const int32_t count = ucnv_toUChars(cnv, room ? to : nullptr, static_cast<int32_t>(room),
+                                              part, static_cast<int32_t>(length), &error);
+          return FromIcu(count, error, room);
+        });
+    // ICU drops an escape or shift that nothing follows (a lone UTF-7 "+"). When that is all
+    // the input, the result would be empty, which Win32 cannot report as success: it becomes
+    // one U+FFFD, like other invalid input.
+    if (r.status != ConvStatus::kOk || r.count != 0 || n == 0) return r;
+    if (capacity != 0) out[0] = 0xFFFD;
+    return {1, ConvStatus::kOk};
   }
 
   ConvResult Encode(const char16_t* s, std::size_t n, const EncodeOptions& options, char* out,
@@ -87,14 +94,15 @@ class StatefulCodec final : public Codec {
       s = restricted.data();
       n = restricted.size();
     }
-    return BySegments(s, n, out, capacity, [cnv](const char16_t* part, std::size_t length,
-                                                 char* to, std::size_t room) {
-      UErrorCode error = U_ZERO_ERROR;
-      ucnv_resetFromUnicode(cnv);
-      const int32_t count = ucnv_fromUChars(cnv, room ? to : nullptr, static_cast<int32_t>(room),
+    return BySegments(s, n, out, capacity,
+                      [cnv](const char16_t* part, std::size_t length, char* to, std::size_t room) {
+                        UErrorCode error = U_ZERO_ERROR;
+                        ucnv_resetFromUnicode(cnv);
+                        const int32_t count =
+                            ucnv_fromUChars(cnv, room ? to : nullptr, static_cast<int32_t>(room),
                                             part, static_cast<int32_t>(length), &error);
-      return FromIcu(count, error, room);
-    });
+                        return FromIcu(count, error, room);
+                      });
   }
 
   bool CanEncode(char16_t, bool) const override { return true; }
@@ -113,10 +121,12 @@ class StatefulCodec final : public Codec {
       std::size_t end = start;
       while (end < n && s[end] != 0) ++end;
       if (end > start) {
+        // A full buffer still takes a piece that converts to nothing (a lone UTF-7 "+").
         const std::size_t room = capacity == 0 ? 0 : capacity - written;
-        if (capacity != 0 && room == 0) return {0, ConvStatus::kBufferTooSmall};
-        const ConvResult part = convert(s + start, end - start, out + (capacity ? written : 0), room);
+        const ConvResult part =
+            convert(s + start, end - start, room ? out + written : nullptr, room);
         if (part.status != ConvStatus::kOk) return part;
+        if (capacity != 0 && room == 0 && part.count != 0) return {0, ConvStatus::kBufferTooSmall};
         written += part.count;
       }
       if (end == n) break;
@@ -141,8 +151,10 @@ class StatefulCodec final : public Codec {
         c = 0x10000 + ((c - 0xD800) << 10) + (s[i + 1] - 0xDC00);
         units = 2;
       }
-      if (uset_contains(allowed_, c)) text.append(s + i, units);
-      else text.push_back(u'\uFFFF');
+      if (uset_contains(allowed_, c))
+        text.append(s + i, units);
+      else
+        text.push_back(u'\uFFFF');
       i += units - 1;
     }
     return text;

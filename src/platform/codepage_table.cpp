@@ -21,8 +21,10 @@ constexpr char16_t kDosGlyph7F = 0x2302;
 
 void ApplyDosGlyphs(const unsigned char* p, std::size_t n, char16_t* out) {
   for (std::size_t i = 0; i < n; ++i) {
-    if (p[i] < 0x20 && p[i] != 0) out[i] = kDosGlyphs[p[i]];
-    else if (p[i] == 0x7F) out[i] = kDosGlyph7F;
+    if (p[i] < 0x20 && p[i] != 0)
+      out[i] = kDosGlyphs[p[i]];
+    else if (p[i] == 0x7F)
+      out[i] = kDosGlyph7F;
   }
 }
 
@@ -65,8 +67,8 @@ bool TableCodec::CanEncode(char16_t c, bool noBestFit) const {
 
 // ---- to UTF-16 ----
 
-ConvResult TableCodec::Decode(const char* s, std::size_t n, bool strict, bool glyphs,
-                              char16_t* out, std::size_t capacity) const {
+ConvResult TableCodec::Decode(const char* s, std::size_t n, bool strict, bool glyphs, char16_t* out,
+                              std::size_t capacity) const {
   const auto* p = reinterpret_cast<const unsigned char*>(s);
   if (doubleByte_) return DecodeDoubleByte(p, n, strict, out, capacity);
   // Every byte is one character.
@@ -187,11 +189,10 @@ ConvResult TableCodec::Encode(const char16_t* s, std::size_t n, const EncodeOpti
   const std::uint32_t accept = options.noBestFit ? kExact : (kExact | kBestFit);
   const Bytes fallback = DefaultBytes(options.defaultChar);
   bool used = false;
-  const ConvResult r =
-      (!doubleByte_ && fallback.length == 1)
-          ? EncodeSingleByte(s, n, accept, fallback.b[0], out, capacity,
-                             options.usedDefault ? &used : nullptr)
-          : EncodeDoubleByte(s, n, accept, fallback, out, capacity, &used);
+  const ConvResult r = (!doubleByte_ && fallback.length == 1)
+                           ? EncodeSingleByte(s, n, accept, fallback.b[0], out, capacity,
+                                              options.usedDefault ? &used : nullptr)
+                           : EncodeDoubleByte(s, n, accept, fallback, out, capacity, &used);
   if (r.status == ConvStatus::kOk && options.usedDefault != nullptr) *options.usedDefault = used;
   return r;
 }
@@ -222,10 +223,10 @@ ConvResult TableCodec::EncodeSingleByte(const char16_t* s, std::size_t n, std::u
   const auto classify = [&](__m128i v, __m128i* bytes) {
     const __m128i ascii = _mm_cmpeq_epi16(_mm_and_si128(v, high), zero);
     // x <= span (unsigned) exactly when the saturating x - span is 0.
-    const __m128i inIdentity = _mm_cmpeq_epi16(
-        _mm_subs_epu16(_mm_sub_epi16(v, identityLo), identitySpan), zero);
-    const __m128i inShifted = _mm_cmpeq_epi16(
-        _mm_subs_epu16(_mm_sub_epi16(v, shiftedLo), shiftedSpan), zero);
+    const __m128i inIdentity =
+        _mm_cmpeq_epi16(_mm_subs_epu16(_mm_sub_epi16(v, identityLo), identitySpan), zero);
+    const __m128i inShifted =
+        _mm_cmpeq_epi16(_mm_subs_epu16(_mm_sub_epi16(v, shiftedLo), shiftedSpan), zero);
     *bytes = _mm_sub_epi16(v, _mm_and_si128(inShifted, delta));
     return _mm_or_si128(ascii, _mm_or_si128(inIdentity, inShifted));
   };

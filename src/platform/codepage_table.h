@@ -20,8 +20,9 @@ class TableCodec final : public Codec {
   // Encode-table entries: the bytes in bits 0-15 (lead byte high for double bytes) and how the
   // character maps. 0 means it does not map.
   static constexpr std::uint32_t kDoubleByte = 1u << 16;
-  static constexpr std::uint32_t kExact = 1u << 17;    // converts back to the same character
-  static constexpr std::uint32_t kBestFit = 1u << 18;  // ICU fallback, refused by WC_NO_BEST_FIT_CHARS
+  static constexpr std::uint32_t kExact = 1u << 17;  // converts back to the same character
+  static constexpr std::uint32_t kBestFit = 1u
+                                            << 18;  // ICU fallback, refused by WC_NO_BEST_FIT_CHARS
 
   explicit TableCodec(const CodePageEntry& entry);
 

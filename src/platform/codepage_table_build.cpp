@@ -58,8 +58,7 @@ int FromUnicode(UConverter* cnv, char16_t c, unsigned char bytes[4]) {
   const UChar in = c;
   UErrorCode error = U_ZERO_ERROR;
   ucnv_resetFromUnicode(cnv);
-  const int32_t count =
-      ucnv_fromUChars(cnv, reinterpret_cast<char*>(bytes), 4, &in, 1, &error);
+  const int32_t count = ucnv_fromUChars(cnv, reinterpret_cast<char*>(bytes), 4, &in, 1, &error);
   if (U_FAILURE(error) || count < 1 || count > 2) return 0;
   return count;
 }
@@ -114,7 +113,8 @@ void BuildEncodeTable(UConverter* cnv, TableCodec& codec) {
                         value | (exact ? TableCodec::kExact : TableCodec::kBestFit));
     }
   }
-  for (int c = 0; c < 0x80; ++c) codec.SetEncoding(static_cast<char16_t>(c), TableCodec::kExact | c);
+  for (int c = 0; c < 0x80; ++c)
+    codec.SetEncoding(static_cast<char16_t>(c), TableCodec::kExact | c);
   // Whatever the tables decode to converts back exactly (the lowest bytes win).
   for (int b = 0x80; b < 256; ++b) {
     const auto byte = static_cast<std::uint8_t>(b);
@@ -127,8 +127,8 @@ void BuildEncodeTable(UConverter* cnv, TableCodec& codec) {
   for (int lead = 0x80; lead < 256; ++lead) {
     if (!codec.IsLead(static_cast<std::uint8_t>(lead))) continue;
     for (int trail = 1; trail < 256; ++trail) {
-      const char16_t u = codec.Double(static_cast<std::uint8_t>(lead),
-                                      static_cast<std::uint8_t>(trail));
+      const char16_t u =
+          codec.Double(static_cast<std::uint8_t>(lead), static_cast<std::uint8_t>(trail));
       if (u == TableCodec::kUnmapped || (codec.Lookup(u) & TableCodec::kExact) != 0) continue;
       codec.SetEncoding(u, TableCodec::kExact | TableCodec::kDoubleByte |
                                static_cast<std::uint32_t>(lead << 8 | trail));

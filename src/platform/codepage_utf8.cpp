@@ -1,6 +1,6 @@
-// UTF-8 <-> UTF-16: SSE2 blocks for ASCII (longer runs through the AVX2 kernels), unrolled
-// scalar paths for well-formed 2-, 3- and 4-byte sequences, and one careful routine for
-// everything irregular (the Unicode "maximal subpart" rule, as Windows, ICU and WHATWG apply it).
+// UTF-8 <-> UTF-16 for every processor: SSE2 blocks for ASCII (longer runs through the ASCII
+// kernels) and the scalar runs of codepage_utf8_scalar.h; processors with AVX2 go to the loops of
+// codepage_utf8_avx2.cpp, which also vectorise 2- and 3-byte characters.
 
 #include "codepage_utf8.h"
 
@@ -22,58 +22,10 @@ inline unsigned Ctz(unsigned v) { return static_cast<unsigned>(__builtin_ctz(v))
 
 // ---- UTF-8 decoding ----
 
-enum class SequenceKind : std::uint8_t { kValid, kInvalid, kTruncated };
-
-struct Sequence {
-  std::size_t length;  // bytes covered: the whole character, or the maximal invalid subpart
-  char32_t codePoint;  // when valid
-  SequenceKind kind;
-};
-
-// Examines the sequence at p (p < end, *p >= 0x80) byte by byte.
-Sequence ExamineUtf8(const std::uint8_t* p, const std::uint8_t* end) noexcept {
-  const std::uint8_t b0 = p[0];
-  std::size_t trail;
-  std::uint8_t lo = 0x80, hi = 0xBF;  // the range of the first trail byte
-  char32_t cp;
-  if (b0 >= 0xC2 && b0 <= 0xDF) {
-    trail = 1;
-    cp = b0 & 0x1F;
-  } else if (b0 >= 0xE0 && b0 <= 0xEF) {
-    trail = 2;
-    cp = b0 & 0x0F;
-    if (b0 == 0xE0) lo = 0xA0;       // no overlong forms
-    else if (b0 == 0xED) hi = 0x9F;  // no surrogates
-  } else if (b0 >= 0xF0 && b0 <= 0xF4) {
-    trail = 3;
-    cp = b0 & 0x07;
-    if (b0 == 0xF0) lo = 0x90;       // no overlong forms
-    else if (b0 == 0xF4) hi = 0x8F;  // nothing above U+10FFFF
-  } else {
-    return {1, 0, SequenceKind::kInvalid};  // stray trail byte, C0, C1, F5..FF
-  }
-  for (std::size_t i = 1; i <= trail; ++i) {
-    if (p + i == end) return {i, 0, SequenceKind::kTruncated};
-    const std::uint8_t b = p[i];
-    if (b < lo || b > hi) return {i, 0, SequenceKind::kInvalid};
-    cp = (cp << 6) | (b & 0x3F);
-    lo = 0x80;
-    hi = 0xBF;
-  }
-  return {trail + 1, cp, SequenceKind::kValid};
-}
-
-struct Utf16Writer {
-  char16_t* out;
+struct Utf16Writer : utf8::UnitWriter {
   char16_t* const begin;
 
-  explicit Utf16Writer(char16_t* o) : out(o), begin(o) {}
-  void Put(char32_t c) { *out++ = static_cast<char16_t>(c); }
-  void PutSupplementary(char32_t c) {
-    out[0] = static_cast<char16_t>(0xD7C0 + (c >> 10));
-    out[1] = static_cast<char16_t>(0xDC00 | (c & 0x3FF));
-    out += 2;
-  }
+  explicit Utf16Writer(char16_t* o) : utf8::UnitWriter{o}, begin(o) {}
   // Writes the 16 widened bytes of v and keeps the first k.
   void Block(__m128i v, unsigned k) {
     const __m128i zero = _mm_setzero_si128();
@@ -89,11 +41,7 @@ struct Utf16Writer {
   std::size_t Count() const { return static_cast<std::size_t>(out - begin); }
 };
 
-struct Utf16Counter {
-  std::size_t count = 0;
-
-  void Put(char32_t) { ++count; }
-  void PutSupplementary(char32_t) { count += 2; }
+struct Utf16Counter : utf8::UnitCounter {
   void Block(__m128i, unsigned k) { count += k; }
   std::size_t Bulk(const std::uint8_t* p, std::size_t n) {
     const std::size_t k = AsciiPrefixLength(p, n);
@@ -125,54 +73,10 @@ TranscodeResult DecodeLoop(const std::uint8_t* s, std::size_t n, Sink& sink, boo
       continue;
     }
     // A run of non-ASCII characters; ASCII goes back to the block loop.
-    do {
-      const std::uint32_t b0 = *p;
-      if (b0 < 0x80) break;
-      const std::ptrdiff_t left = end - p;
-      if (b0 >= 0xC2 && b0 <= 0xDF) {
-        if (left >= 2 && (p[1] & 0xC0) == 0x80) {
-          sink.Put(((b0 & 0x1F) << 6) | (p[1] & 0x3F));
-          p += 2;
-          continue;
-        }
-      } else if ((b0 & 0xF0) == 0xE0) {
-        if (left >= 3) {
-          const std::uint32_t b1 = p[1], b2 = p[2];
-          const std::uint32_t c = ((b0 & 0x0F) << 12) | ((b1 & 0x3F) << 6) | (b2 & 0x3F);
-          // Two trail bytes, not overlong, not a surrogate.
-          if ((b1 & 0xC0) == 0x80 && (b2 & 0xC0) == 0x80 && c >= 0x800 && (c & 0xF800) != 0xD800) {
-            sink.Put(c);
-            p += 3;
-            continue;
-          }
-        }
-      } else if (b0 >= 0xF0 && b0 <= 0xF4) {
-        if (left >= 4) {
-          const std::uint32_t b1 = p[1], b2 = p[2], b3 = p[3];
-          const std::uint32_t c = ((b0 & 0x07) << 18) | ((b1 & 0x3F) << 12) |
-                                  ((b2 & 0x3F) << 6) | (b3 & 0x3F);
-          if ((b1 & 0xC0) == 0x80 && (b2 & 0xC0) == 0x80 && (b3 & 0xC0) == 0x80 &&
-              c >= 0x10000 && c <= 0x10FFFF) {
-            sink.PutSupplementary(c);
-            p += 4;
-            continue;
-          }
-        }
-      }
-      const Sequence seq = ExamineUtf8(p, end);
-      if (seq.kind == SequenceKind::kValid) {  // only reached when a fast path was skipped
-        if (seq.codePoint >= 0x10000) sink.PutSupplementary(seq.codePoint);
-        else sink.Put(seq.codePoint);
-        p += seq.length;
-        continue;
-      }
-      if (seq.kind == SequenceKind::kTruncated && !final) {
-        return {static_cast<std::size_t>(p - s), sink.Count(), false};
-      }
-      if (kStrict) return {static_cast<std::size_t>(p - s), sink.Count(), true};
-      sink.Put(kReplacement);
-      p += seq.length;
-    } while (p != end);
+    const utf8::RunEnd r = utf8::DecodeRun<kStrict>(p, end, end, sink, final, true);
+    if (r != utf8::RunEnd::kDone) {
+      return {static_cast<std::size_t>(p - s), sink.Count(), r == utf8::RunEnd::kInvalid};
+    }
   }
   return {n, sink.Count(), false};
 }
@@ -183,10 +87,10 @@ TranscodeResult DecodeLoop(const std::uint8_t* s, std::size_t n, Sink& sink, boo
 inline unsigned AsciiUnitMask(__m128i v0, __m128i v1) {
   const __m128i high = _mm_set1_epi16(static_cast<short>(0xFF80));
   const __m128i zero = _mm_setzero_si128();
-  const unsigned m0 = static_cast<unsigned>(
-      _mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
-  const unsigned m1 = static_cast<unsigned>(
-      _mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
+  const unsigned m0 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
+  const unsigned m1 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
   return m0 | (m1 << 16);
 }
 
@@ -206,8 +110,8 @@ TranscodeResult EncodeLoop(const char16_t* s, std::size_t n, char* out, bool fin
         p += 16;
         w.out += 16;
         if (end - p >= 32) {
-          const std::size_t k =
-              NarrowAsciiPrefix(p, static_cast<std::size_t>(end - p), reinterpret_cast<char*>(w.out));
+          const std::size_t k = NarrowAsciiPrefix(p, static_cast<std::size_t>(end - p),
+                                                  reinterpret_cast<char*>(w.out));
           p += k;
           w.out += k;
         }
@@ -248,6 +152,7 @@ inline std::size_t Utf8LengthOf(const char16_t* p, const char16_t* end, bool str
 
 TranscodeResult DecodeUtf8(const char* s, std::size_t n, char16_t* out, bool strict,
                            bool final) noexcept {
+  if (UsingAvx2()) return DecodeUtf8Avx2(s, n, out, strict, final);
   Utf16Writer sink(out);
   const auto* bytes = reinterpret_cast<const std::uint8_t*>(s);
   return strict ? DecodeLoop<Utf16Writer, true>(bytes, n, sink, final)
@@ -255,6 +160,7 @@ TranscodeResult DecodeUtf8(const char* s, std::size_t n, char16_t* out, bool str
 }
 
 CountResult CountUtf8(const char* s, std::size_t n, bool strict) noexcept {
+  if (UsingAvx2()) return CountUtf8Avx2(s, n, strict);
   Utf16Counter sink;
   const auto* bytes = reinterpret_cast<const std::uint8_t*>(s);
   const TranscodeResult r = strict ? DecodeLoop<Utf16Counter, true>(bytes, n, sink, true)
@@ -318,9 +224,9 @@ std::size_t DecodeOneUtf8(const char* s, std::size_t n, bool strict, std::size_t
     units[0] = p[0];
     return 1;
   }
-  const Sequence seq = ExamineUtf8(p, p + n);
+  const utf8::Sequence seq = utf8::ExamineUtf8(p, p + n);
   *length = seq.length;
-  if (seq.kind != SequenceKind::kValid) {
+  if (seq.kind != utf8::SequenceKind::kValid) {
     if (strict) return 0;
     units[0] = kReplacement;
     return 1;
@@ -339,10 +245,14 @@ std::size_t EncodeOneUtf8(const char16_t* s, std::size_t n, bool strict, std::si
   const std::size_t count = Utf8LengthOf(s, s + n, strict, length);
   if (count == 0) return 0;
   utf8::ByteWriter sink(bytes);
-  if (count == 1) sink.Put1(s[0]);
-  else if (count == 2) sink.Put2(s[0]);
-  else if (count == 4) sink.Put4(0x10000 + ((s[0] - 0xD800u) << 10) + (s[1] - 0xDC00u));
-  else sink.Put3((s[0] & 0xF800) == 0xD800 ? kReplacement : s[0]);
+  if (count == 1)
+    sink.Put1(s[0]);
+  else if (count == 2)
+    sink.Put2(s[0]);
+  else if (count == 4)
+    sink.Put4(0x10000 + ((s[0] - 0xD800u) << 10) + (s[1] - 0xDC00u));
+  else
+    sink.Put3((s[0] & 0xF800) == 0xD800 ? kReplacement : s[0]);
   return count;
 }
 

@@ -30,8 +30,11 @@ TranscodeResult EncodeUtf8(const char16_t* s, std::size_t n, char* out, bool str
                            bool final) noexcept;
 CountResult CountUtf16AsUtf8(const char16_t* s, std::size_t n, bool strict) noexcept;
 
-// EncodeUtf8 with AVX2 kernels for 2- and 3-byte characters (codepage_utf8_avx2.cpp); only for
-// processors that have AVX2. Same contract as EncodeUtf8.
+// The same with AVX2 kernels for 2- and 3-byte characters (codepage_utf8_avx2.cpp), only for
+// processors that have AVX2; DecodeUtf8 and the others call them when they can.
+TranscodeResult DecodeUtf8Avx2(const char* s, std::size_t n, char16_t* out, bool strict,
+                               bool final) noexcept;
+CountResult CountUtf8Avx2(const char* s, std::size_t n, bool strict) noexcept;
 TranscodeResult EncodeUtf8Avx2(const char16_t* s, std::size_t n, char* out, bool strict,
                                bool final) noexcept;
 

@@ -3,28 +3,15 @@
 #include "vynutil/char_convert.h"
 
 #include "vynutil/vynstring.h"
+#include "strings/utf16_units.h"
 #include "win32/last_error.h"
 
 namespace VynSDK::Util {
 
 namespace {
 
-constexpr bool IsLeadSurrogate(MCHAR unit) noexcept { return (unit & 0xFC00) == 0xD800; }
-
-// UTF-16 units of one code point; writes them to units[0..1].
-unsigned EncodeUtf16(unsigned int c, MCHAR units[2]) noexcept {
-  if (c < 0x10000) {
-    units[0] = static_cast<MCHAR>(c);
-    return 1;
-  }
-  units[0] = static_cast<MCHAR>(0xD800u | ((((c >> 16) & 0x1Fu) - 1u) << 6) | ((c & 0xFFFFu) >> 10));
-  units[1] = static_cast<MCHAR>(0xDC00u | (c & 0x3FFu));
-  return 2;
-}
-
-constexpr unsigned int CombineSurrogates(MCHAR lead, MCHAR trail) noexcept {
-  return (static_cast<unsigned int>(lead) << 10) + trail - 0x35FDC00u;
-}
+using Utf16Units::Combine;
+using Utf16Units::IsLeadSurrogate;
 
 // Walks the UTF-16 source one character at a time: calls emit(codePoint) for each and returns
 // when the source is exhausted (the terminator is emitted in terminator mode) or emit says stop.
@@ -36,7 +23,7 @@ void WalkUtf16(const MCHAR* src, std::size_t srcCount, Emit emit) {
     bool hasNext = toTerminator ? unit != 0 : i + 1 < srcCount;
     if (IsLeadSurrogate(unit) && hasNext) {
       MCHAR trail = src[i + 1];
-      if (!emit(CombineSurrogates(unit, trail))) return;
+      if (!emit(Combine(unit, trail))) return;
       // In terminator mode a lead surrogate just before the terminator takes it: the text ends.
       if (toTerminator && trail == 0) return;
       i += 2;
@@ -65,15 +52,15 @@ std::size_t UTF32ToWideChar(const unsigned int* src, std::size_t srcCount, MCHAR
   std::size_t written = 0;
   if (dstCount == 0) {
     WalkUtf32(src, srcCount, [&](unsigned int c) {
-      written += c < 0x10000 ? 1 : 2;
+      written += Utf16Units::UnitCount(c);
       return true;
     });
     return written;
   }
   bool overflow = false;
   WalkUtf32(src, srcCount, [&](unsigned int c) {
-    MCHAR units[2];
-    unsigned n = EncodeUtf16(c, units);
+    MCHAR units[Utf16Units::kMaxUnits];
+    unsigned n = Utf16Units::Encode(c, units);
     if (dstCount - written < n) {
       overflow = true;
       return false;

@@ -57,7 +57,8 @@ TEST(CodePageApi, MultiByteToWideCharErrors) {
       {"unknown code page", [] { return MultiByteToWideChar(12345, 0, "abc", 3, wide, 16); },
        ERROR_INVALID_PARAMETER},
       {"CP_UTF16 is no platform code page",
-       [] { return MultiByteToWideChar(CP_UTF16, 0, "abc", 3, wide, 16); }, ERROR_INVALID_PARAMETER},
+       [] { return MultiByteToWideChar(CP_UTF16, 0, "abc", 3, wide, 16); },
+       ERROR_INVALID_PARAMETER},
       {"CP_NEUTRAL", [] { return MultiByteToWideChar(CP_NEUTRAL, 0, "abc", 3, wide, 16); },
        ERROR_INVALID_PARAMETER},
       {"CP_UTF32", [] { return MultiByteToWideChar(CP_UTF32, 0, "abc", 3, wide, 16); },
@@ -173,9 +174,9 @@ TEST(CodePageApi, PseudoCodePagesResolveFirst) {
 }
 
 TEST(CodePageApi, CodePageQueries) {
-  for (UINT cp : {437u, 850u, 874u, 932u, 936u, 949u, 950u, 1250u, 1252u, 1258u, 10000u, 20127u,
-                  20866u, 21866u, 28591u, 28605u, 50222u, 50225u, CP_UTF7, CP_UTF8, CP_ACP,
-                  CP_OEMCP, CP_MACCP, CP_THREAD_ACP}) {
+  for (UINT cp : {437u,   850u,   874u,    932u,    936u,   949u,     950u,     1250u,
+                  1252u,  1258u,  10000u,  20127u,  20866u, 21866u,   28591u,   28605u,
+                  50222u, 50225u, CP_UTF7, CP_UTF8, CP_ACP, CP_OEMCP, CP_MACCP, CP_THREAD_ACP}) {
     EXPECT_TRUE(IsValidCodePage(cp)) << cp;
   }
   for (UINT cp : {CP_UTF16, CP_NEUTRAL, CP_UTF32, 1200u, 9999u, 65002u}) {

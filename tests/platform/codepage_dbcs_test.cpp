@@ -99,7 +99,8 @@ TEST(CodePageDoubleByte, EveryPairAgainstIcuAndBack) {
         ucnv_reset(cnv);
         const int32_t n = ucnv_toUChars(cnv, reference, 4, pair, 2, &error);
         MCHAR got[2] = {0, 0};
-        ASSERT_EQ(MultiByteToWideChar(page.codePage, 0, pair, 2, got, 2), 1) << lead << "," << trail;
+        ASSERT_EQ(MultiByteToWideChar(page.codePage, 0, pair, 2, got, 2), 1)
+            << lead << "," << trail;
         if (U_SUCCESS(error) && n == 1) {
           ++mapped;
           ASSERT_EQ(got[0], reference[0]) << lead << "," << trail;
@@ -135,7 +136,8 @@ TEST(CodePageDoubleByte, InvalidSequences) {
       {"undefined pair", 932, "\x81\xAD", u"\u30FB"},
       {"trail byte out of range takes the pair", 932, "\x81\x20x", u"\u30FBx"},
       {"lone lead byte at the end", 932, "a\x81", u"a\u30FB"},
-      {"lone lead byte before NUL", 932, std::string("\x81\0b", 3), std::u16string(u"\u30FB\0b", 3)},
+      {"lone lead byte before NUL", 932, std::string("\x81\0b", 3),
+       std::u16string(u"\u30FB\0b", 3)},
       {"936 euro", 936, "\x80", u"\u20AC"},
       {"936 undefined 0xFF", 936, "\xFF", u"\uF8F5"},
       {"936 lone lead byte", 936, "\xB0", u"?"},
@@ -180,7 +182,7 @@ TEST(CodePageStateful, RoundTripsAndRules) {
   const std::u16string japanese = u"ABC \u65E5\u672C\u8A9E \uFF71\uFF72 xyz";
   const std::string jis = Encode(50222, japanese);
   EXPECT_NE(jis.find("\x1B$B"), std::string::npos);  // JIS X 0208 designation
-  EXPECT_NE(jis.find('\x0E'), std::string::npos);     // halfwidth katakana shifted in with SO
+  EXPECT_NE(jis.find('\x0E'), std::string::npos);    // halfwidth katakana shifted in with SO
   EXPECT_EQ(Decode(50222, jis), japanese);
   // Characters outside JIS X 0208 become the default character rather than ISO-2022-JP-2 sets.
   EXPECT_EQ(Encode(50222, u"\u00E9"), "?");
@@ -193,6 +195,12 @@ TEST(CodePageStateful, RoundTripsAndRules) {
   const std::u16string mixed = u"Hi \u00E9\u20AC \U0001F600!";
   EXPECT_EQ(Decode(CP_UTF7, Encode(CP_UTF7, mixed)), mixed);
   EXPECT_EQ(Decode(CP_UTF7, "Hi Mom -+Jjo--!"), u"Hi Mom -\u263A-!");  // RFC 2152 example
+  // A shift into base64 with nothing after it (found by the fuzzer): the conversion still
+  // succeeds, with a replacement character, instead of returning 0 without an error.
+  EXPECT_EQ(Decode(CP_UTF7, "+"), u"\uFFFD");
+  // NUL passes through UTF-7 (a terminated text stays terminated); a buffer filled up to a
+  // final piece that converts to nothing is big enough (also found by the fuzzer).
+  EXPECT_EQ(Decode(CP_UTF7, std::string("\xFF\0+", 3)), std::u16string(u"\uFFFD\0", 2));
 
   // Windows takes no flags and no used-default report for these code pages.
   MCHAR wide[8];

@@ -28,16 +28,20 @@ class Environment {
   }
   ~Environment() {
     for (std::size_t i = 0; i < std::size(kNames); ++i) {
-      if (saved_[i]) setenv(kNames[i], saved_[i]->c_str(), 1);
-      else unsetenv(kNames[i]);
+      if (saved_[i])
+        setenv(kNames[i], saved_[i]->c_str(), 1);
+      else
+        unsetenv(kNames[i]);
     }
     SetProcessCodePages(0, 0);
     ReloadProcessCodePages();
   }
   // Sets (or, with null, removes) a variable and makes the next query read the environment.
   void Set(const char* name, const char* value) {
-    if (value) setenv(name, value, 1);
-    else unsetenv(name);
+    if (value)
+      setenv(name, value, 1);
+    else
+      unsetenv(name);
     ReloadProcessCodePages();
   }
 
@@ -113,9 +117,8 @@ TEST(CodePageProcess, SetProcessCodePagesPins) {
 TEST(CodePageProcess, UserLocaleFromTheEnvironment) {
   Environment env;
   const std::pair<const char*, LCID> rows[] = {
-      {"C", 1033},           {"en_US.UTF-8", 1033}, {"ja_JP.UTF-8", 1041},
-      {"de_DE", 1031},       {"zh_TW.Big5", 1028},  {"sr_RS@latin", 0x241A},
-      {"fr", 1036},          {"POSIX", 1033},
+      {"C", 1033},          {"en_US.UTF-8", 1033},   {"ja_JP.UTF-8", 1041}, {"de_DE", 1031},
+      {"zh_TW.Big5", 1028}, {"sr_RS@latin", 0x241A}, {"fr", 1036},          {"POSIX", 1033},
   };
   for (const auto& [value, lcid] : rows) {
     env.Set("LC_ALL", value);
@@ -130,13 +133,17 @@ TEST(CodePageProcess, LocaleInfoCodePages) {
   };
   // Windows' values (LOCALE_IDEFAULTCODEPAGE, ...ANSICODEPAGE, ...MACCODEPAGE).
   const Row rows[] = {
-      {1033, 437, 1252, 10000}, {2057, 850, 1252, 10000}, {1031, 850, 1252, 10000},
-      {1041, 932, 932, 10001},  {2052, 936, 936, 10008},  {1042, 949, 949, 10003},
-      {1028, 950, 950, 10002},  {1049, 866, 1251, 10007}, {1045, 852, 1250, 10029},
-      {1029, 852, 1250, 10029}, {1038, 852, 1250, 10029}, {1032, 737, 1253, 10006},
-      {1055, 857, 1254, 10081}, {1037, 862, 1255, 10005}, {1025, 720, 1256, 10004},
-      {1063, 775, 1257, 10029}, {1066, 1258, 1258, 10000}, {1054, 874, 874, 10021},
-      {1050, 852, 1250, 10082}, {1058, 866, 1251, 10017}, {0x0439, 1, 0, 2},  // Hindi: Unicode only
+      {1033, 437, 1252, 10000},  {2057, 850, 1252, 10000},
+      {1031, 850, 1252, 10000},  {1041, 932, 932, 10001},
+      {2052, 936, 936, 10008},   {1042, 949, 949, 10003},
+      {1028, 950, 950, 10002},   {1049, 866, 1251, 10007},
+      {1045, 852, 1250, 10029},  {1029, 852, 1250, 10029},
+      {1038, 852, 1250, 10029},  {1032, 737, 1253, 10006},
+      {1055, 857, 1254, 10081},  {1037, 862, 1255, 10005},
+      {1025, 720, 1256, 10004},  {1063, 775, 1257, 10029},
+      {1066, 1258, 1258, 10000}, {1054, 874, 874, 10021},
+      {1050, 852, 1250, 10082},  {1058, 866, 1251, 10017},
+      {0x0439, 1, 0, 2},  // Hindi: Unicode only
   };
   for (const Row& row : rows) {
     SCOPED_TRACE(row.lcid);
@@ -156,7 +163,8 @@ TEST(CodePageProcess, LocaleInfoCodePages) {
     }
   }
   MCHAR buffer[8];
-  EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, nullptr, 0), 2);
+  EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, nullptr, 0),
+            2);
   EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE, nullptr, 0), 5);
   SetLastError(0);
   EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, buffer, 1), 0);

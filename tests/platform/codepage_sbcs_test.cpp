@@ -38,23 +38,33 @@ std::map<unsigned, char16_t> HighHalfStripped() {
 }
 
 const SingleBytePage kPages[] = {
-    {437, "ibm-437_P100-1995", {}},       {720, "ibm-720_P100-1997", {}},
-    {737, "ibm-737_P100-1997", {}},       {775, "ibm-775_P100-1996", {}},
+    {437, "ibm-437_P100-1995", {}},
+    {720, "ibm-720_P100-1997", {}},
+    {737, "ibm-737_P100-1997", {}},
+    {775, "ibm-775_P100-1996", {}},
     {850, "ibm-850_P100-1995", {}},
     // Microsoft's CP852.TXT: 0xAA NOT SIGN (IBM's table has no mapping).
     {852, "ibm-852_P100-1995", {{0xAA, 0x00AC}}},
-    {855, "ibm-855_P100-1995", {}},       {857, "ibm-857_P100-1995", {}},
-    {858, "ibm-858_P100-1997", {}},       {860, "ibm-860_P100-1995", {}},
-    {861, "ibm-861_P100-1995", {}},       {862, "ibm-862_P100-1995", {}},
-    {863, "ibm-863_P100-1995", {}},       {865, "ibm-865_P100-1995", {}},
-    {866, "ibm-866_P100-1995", {}},       {869, "ibm-869_P100-1995", {}},
-    {874, "windows-874", {}},             {1250, "windows-1250", {}},
-    {1251, "windows-1251", {}},           {1252, "windows-1252", {}},
+    {855, "ibm-855_P100-1995", {}},
+    {857, "ibm-857_P100-1995", {}},
+    {858, "ibm-858_P100-1997", {}},
+    {860, "ibm-860_P100-1995", {}},
+    {861, "ibm-861_P100-1995", {}},
+    {862, "ibm-862_P100-1995", {}},
+    {863, "ibm-863_P100-1995", {}},
+    {865, "ibm-865_P100-1995", {}},
+    {866, "ibm-866_P100-1995", {}},
+    {869, "ibm-869_P100-1995", {}},
+    {874, "windows-874", {}},
+    {1250, "windows-1250", {}},
+    {1251, "windows-1251", {}},
+    {1252, "windows-1252", {}},
     // bestfit1253.txt (unicode.org, VENDORS/MICSFT/WindowsBestFit): undefined -> EUDC.
     {1253, "windows-1253", {{0xAA, 0xF8F9}, {0xD2, 0xF8FA}, {0xFF, 0xF8FB}}},
     {1254, "windows-1254", {}},
     // bestfit1255.txt: 0xCA HEBREW POINT QAMATS QATAN, the rest undefined -> EUDC.
-    {1255, "windows-1255", [] {
+    {1255, "windows-1255",
+     [] {
        auto m = Range(0xD9, 0xDF, 0xF88D);
        m[0xCA] = 0x05BA;
        m[0xFB] = 0xF894;
@@ -68,17 +78,25 @@ const SingleBytePage kPages[] = {
     {1258, "windows-1258", {}},
     // Microsoft's MAC/ROMAN.TXT: OHM SIGN and CURRENCY SIGN (Apple's later table: Omega, euro).
     {10000, "macos-0_2-10.2", {{0xBD, 0x2126}, {0xDB, 0x00A4}}},
-    {10006, "macos-6_2-10.4", {}},        {10007, "macos-7_3-10.2", {}},
-    {10017, "macos-7_3-10.2", {}},        {10029, "macos-29-10.2", {}},
+    {10006, "macos-6_2-10.4", {}},
+    {10007, "macos-7_3-10.2", {}},
+    {10017, "macos-7_3-10.2", {}},
+    {10029, "macos-29-10.2", {}},
     {10081, "macos-35-10.2", {}},
     // Windows' US-ASCII table repeats ASCII in the high half (the eighth bit is dropped).
     {20127, "US-ASCII", HighHalfStripped()},
-    {20866, "KOI8-R", {}},                {21866, "KOI8-U", {}},
-    {28591, "ISO-8859-1", {}},            {28592, "ISO-8859-2", {}},
-    {28593, "ISO-8859-3", {}},            {28594, "ISO-8859-4", {}},
-    {28595, "ISO-8859-5", {}},            {28596, "ISO-8859-6", {}},
-    {28597, "ISO-8859-7", {}},            {28598, "ISO-8859-8", {}},
-    {28599, "ISO-8859-9", {}},            {28603, "ISO-8859-13", {}},
+    {20866, "KOI8-R", {}},
+    {21866, "KOI8-U", {}},
+    {28591, "ISO-8859-1", {}},
+    {28592, "ISO-8859-2", {}},
+    {28593, "ISO-8859-3", {}},
+    {28594, "ISO-8859-4", {}},
+    {28595, "ISO-8859-5", {}},
+    {28596, "ISO-8859-6", {}},
+    {28597, "ISO-8859-7", {}},
+    {28598, "ISO-8859-8", {}},
+    {28599, "ISO-8859-9", {}},
+    {28603, "ISO-8859-13", {}},
     {28605, "ISO-8859-15", {}},
 };
 
@@ -158,9 +176,9 @@ TEST(CodePageSingleByte, EveryByteRoundTrips) {
     std::string all(256, '\0');
     for (int b = 0; b < 256; ++b) all[b] = static_cast<char>(b);
     std::u16string wide(256, u'\0');
-    ASSERT_EQ(MultiByteToWideChar(page.codePage, MB_ERR_INVALID_CHARS, all.data(), 256,
-                                  wide.data(), 256),
-              256);
+    ASSERT_EQ(
+        MultiByteToWideChar(page.codePage, MB_ERR_INVALID_CHARS, all.data(), 256, wide.data(), 256),
+        256);
     BOOL used = TRUE;
     const std::string back = Encode(page.codePage, wide, WC_NO_BEST_FIT_CHARS, &used);
     EXPECT_FALSE(used);

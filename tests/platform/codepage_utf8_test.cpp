@@ -73,8 +73,9 @@ std::string Win32ToUtf8(const std::u16string& s, DWORD flags = 0) {
   const int needed = WideCharToMultiByte(CP_UTF8, flags, s.data(), n, nullptr, 0, nullptr, nullptr);
   std::string out(needed, '\0');
   if (needed > 0) {
-    EXPECT_EQ(WideCharToMultiByte(CP_UTF8, flags, s.data(), n, out.data(), needed, nullptr, nullptr),
-              needed);
+    EXPECT_EQ(
+        WideCharToMultiByte(CP_UTF8, flags, s.data(), n, out.data(), needed, nullptr, nullptr),
+        needed);
   }
   return out;
 }
@@ -124,8 +125,8 @@ TEST(CodePageUtf8, ReplacementRules) {
     EXPECT_EQ(IcuFromUtf8(row.bytes), row.expected);  // the reference agrees with the table
     // Long enough for the vector paths, at an odd offset.
     const std::string padded = std::string(37, 'x') + row.bytes + std::string(21, 'y');
-    EXPECT_EQ(FastToUtf16(padded), u"xxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxx" + row.expected +
-                                       u"yyyyyyyyyyyyyyyyyyyyy");
+    EXPECT_EQ(FastToUtf16(padded),
+              u"xxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxx" + row.expected + u"yyyyyyyyyyyyyyyyyyyyy");
     const bool valid = row.expected.find(u'\uFFFD') == std::u16string::npos;
     SetLastError(0);
     const int strict = MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, row.bytes.data(),
@@ -165,9 +166,9 @@ TEST(CodePageUtf8, LoneSurrogatesBecomeReplacementCharacters) {
     EXPECT_EQ(FastToUtf8(padded), std::string(19, 'x') + row.expected + std::string(40, 'y'));
     const bool valid = row.expected.find("\xEF\xBF\xBD") == std::string::npos;
     SetLastError(0);
-    const int strict = WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, row.units.data(),
-                                           static_cast<int>(row.units.size()), nullptr, 0,
-                                           nullptr, nullptr);
+    const int strict =
+        WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, row.units.data(),
+                            static_cast<int>(row.units.size()), nullptr, 0, nullptr, nullptr);
     EXPECT_EQ(strict, valid ? static_cast<int>(row.expected.size()) : 0);
     if (!valid) {
       EXPECT_EQ(GetLastError(), ERROR_NO_UNICODE_TRANSLATION);
@@ -178,16 +179,28 @@ TEST(CodePageUtf8, LoneSurrogatesBecomeReplacementCharacters) {
 // Text made of pieces chosen to hit every path: ASCII runs of every length around the vector
 // widths, 2-, 3- and 4-byte characters, and broken sequences.
 std::string RandomUtf8(std::mt19937& rng, bool corrupt) {
-  static const char* const kPieces[] = {
-      "a", "0123456789abcdef", "0123456789abcdefghijklmnopqrstuv", "\xC3\xA9", "\xD0\x96",
-      "\xE2\x82\xAC", "\xE6\x97\xA5\xE6\x9C\xAC", "\xF0\x9F\x98\x80", "\xEF\xBF\xBD", " ", "\n"};
-  static const char* const kBroken[] = {"\x80", "\xC3", "\xE2\x82", "\xF0\x9F\x98", "\xC0\xAF",
-                                        "\xED\xA0\x80", "\xF4\x90\x80\x80", "\xFF", "\xE0\x9F\xBF"};
+  static const char* const kPieces[] = {"a",
+                                        "0123456789abcdef",
+                                        "0123456789abcdefghijklmnopqrstuv",
+                                        "\xC3\xA9",
+                                        "\xD0\x96",
+                                        "\xE2\x82\xAC",
+                                        "\xE6\x97\xA5\xE6\x9C\xAC",
+                                        "\xF0\x9F\x98\x80",
+                                        "\xEF\xBF\xBD",
+                                        " ",
+                                        "\n"};
+  static const char* const kBroken[] = {
+      "\x80",        "\xC3",         "\xE2\x82",         "\xF0\x9F\x98",
+      "\xC0\xAF",    "\xED\xA0\x80", "\xF4\x90\x80\x80", "\xFF",
+      "\xE0\x9F\xBF"};
   std::string s;
   const int pieces = std::uniform_int_distribution<int>(0, 40)(rng);
   for (int i = 0; i < pieces; ++i) {
-    if (corrupt && rng() % 5 == 0) s += kBroken[rng() % std::size(kBroken)];
-    else s += kPieces[rng() % std::size(kPieces)];
+    if (corrupt && rng() % 5 == 0)
+      s += kBroken[rng() % std::size(kBroken)];
+    else
+      s += kPieces[rng() % std::size(kPieces)];
   }
   return s;
 }
@@ -217,8 +230,8 @@ TEST(CodePageUtf8, AgreesWithIcuAndWin32OnRandomText) {
 
 TEST(CodePageUtf8, RandomUtf16AgreesWithIcu) {
   std::mt19937 rng(77);
-  static const char16_t kUnits[] = {u'a', u'Z', 0x7F, 0x80, 0x7FF, 0x800, 0x20AC, 0xD7FF, 0xD800,
-                                    0xDBFF, 0xDC00, 0xDFFF, 0xE000, 0xFFFD, 0xFFFF};
+  static const char16_t kUnits[] = {u'a',   u'Z',   0x7F,   0x80,   0x7FF,  0x800,  0x20AC, 0xD7FF,
+                                    0xD800, 0xDBFF, 0xDC00, 0xDFFF, 0xE000, 0xFFFD, 0xFFFF};
   for (int round = 0; round < 3000; ++round) {
     std::u16string s(rng() % 150, u'\0');
     for (char16_t& c : s) c = rng() % 3 ? kUnits[rng() % std::size(kUnits)] : char16_t(rng());
@@ -256,8 +269,8 @@ TEST(CodePageUtf8, BufferSizesAroundTheNeededSize) {
   for (int size = 1; size <= backNeeded + 2; ++size) {
     std::string out(size + 8, '#');
     SetLastError(0);
-    const int got = WideCharToMultiByte(CP_UTF8, 0, units.data(), needed, out.data(), size,
-                                        nullptr, nullptr);
+    const int got =
+        WideCharToMultiByte(CP_UTF8, 0, units.data(), needed, out.data(), size, nullptr, nullptr);
     if (size < backNeeded) {
       EXPECT_EQ(got, 0) << size;
       EXPECT_EQ(GetLastError(), ERROR_INSUFFICIENT_BUFFER) << size;
