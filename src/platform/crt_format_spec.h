@@ -8,6 +8,13 @@
 
 namespace win32::detail {
 
+// The outcome of formatting.
+enum class FormatStatus {
+  kOk,
+  kInvalidFormat,   // unknown conversion, %n, a number out of range, or the end inside a conversion
+  kUnconvertible,   // a string argument the locale's code page cannot convert
+};
+
 enum class SizePrefix : std::uint8_t { kNone, kHH, kH, kL, kLL, kBigL, kI, kI32, kI64, kJ, kZ, kT, kW };
 
 struct ConversionSpec {

@@ -17,9 +17,15 @@ namespace VynSDK::Util::StringBlocks {
 
 namespace {
 
-void* AllocateBytes(std::size_t bytes) { return VynHeapOperators::operator new(bytes); }
+// Blocks and forms come from the library's one heap (the runtime's malloc, as every
+// VynHeapOperators allocation): a plain malloc first, and on failure the throwing allocation,
+// which gives the new handler its chance and raises std::bad_alloc.
+void* AllocateBytes(std::size_t bytes) {
+  if (void* p = std::malloc(bytes)) return p;
+  return VynHeapOperators::operator new(bytes);
+}
 
-void FreeBytes(void* p) noexcept { VynHeapOperators::operator delete(p); }
+void FreeBytes(void* p) noexcept { std::free(p); }
 
 // header + characters + spare, refusing sizes that wrap around.
 std::size_t BlockSize(std::size_t header, std::size_t charBytes) {

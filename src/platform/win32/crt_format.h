@@ -6,7 +6,9 @@
 // always narrow, %ls/%lc/%ws/%wc always wide. Narrow formats: %s/%c narrow, %S/%C wide. Narrow
 // text in a wide format is decoded with the locale's code page, wide text in a narrow format
 // encoded with it; a string that does not convert fails the call, a character that does not
-// convert is left out. A null string prints "(null)".
+// convert is left out. A null string prints "(null)". A precision counts units of the argument
+// (a multi-byte character it would split is left out of converted text); a width counts units
+// of the output. The '0' flag pads every conversion with zeros except infinities and NaNs.
 // Integer sizes: none, %l and %I32 read 32 bits (long is 32 bits on Windows); %hh and %h a char
 // and a short; %ll, %I64, %I, %z, %t and %j 64 bits. %p prints 16 upper-case hex digits.
 // %L reads a long double; every floating value prints as a double, as on Windows.
