@@ -62,6 +62,12 @@ __attribute__((no_sanitize("address"))) std::size_t Utf16Length(const char16_t* 
   return (found - address) / sizeof(char16_t);
 }
 
+// The CP_UTF8 entry, looked up once: the most common code page skips the lookup.
+const CodePageEntry& Utf8Entry() {
+  static const CodePageEntry* const entry = detail::FindCodePage(CP_UTF8);
+  return *entry;
+}
+
 bool DecodeFlagsValid(const CodePageEntry& entry, DWORD flags) {
   switch (entry.kind) {
     case CodePageKind::kStateful: return flags == 0;
@@ -122,10 +128,11 @@ int MultiByteToWideChar(UINT CodePage, DWORD dwFlags, const char* lpMultiByteStr
   if (capacity > 0 && Overlap(lpMultiByteStr, n, lpWideCharStr, capacity * sizeof(MCHAR))) {
     return Fail(ERROR_INVALID_PARAMETER);
   }
-  const CodePageEntry* entry = detail::LookUpCodePage(CodePage);
+  const bool strict = (dwFlags & MB_ERR_INVALID_CHARS) != 0;
+  const CodePageEntry* entry =
+      CodePage == CP_UTF8 ? &Utf8Entry() : detail::LookUpCodePage(CodePage);
   if (entry == nullptr) return Fail(ERROR_INVALID_PARAMETER);
   if (!DecodeFlagsValid(*entry, dwFlags)) return Fail(ERROR_INVALID_FLAGS);
-  const bool strict = (dwFlags & MB_ERR_INVALID_CHARS) != 0;
   if (entry->kind == CodePageKind::kUtf8) {  // the common case, without the codec
     return Finish(detail::DecodeUtf8Bounded(lpMultiByteStr, n, strict, lpWideCharStr, capacity));
   }
@@ -153,7 +160,8 @@ int WideCharToMultiByte(UINT CodePage, DWORD dwFlags, const MCHAR* lpWideCharStr
   if (capacity > 0 && Overlap(lpWideCharStr, n * sizeof(MCHAR), lpMultiByteStr, capacity)) {
     return Fail(ERROR_INVALID_PARAMETER);
   }
-  const CodePageEntry* entry = detail::LookUpCodePage(CodePage);
+  const CodePageEntry* entry =
+      CodePage == CP_UTF8 ? &Utf8Entry() : detail::LookUpCodePage(CodePage);
   if (entry == nullptr) return Fail(ERROR_INVALID_PARAMETER);
   if (const DWORD error = EncodeArgumentsError(*entry, dwFlags, lpDefaultChar, lpUsedDefaultChar)) {
     return Fail(error);

@@ -195,6 +195,24 @@ VYN_TARGET_AVX2 inline unsigned DecodeBlock16(const std::uint8_t* p, char16_t* o
   return 16 - carried;
 }
 
+// The scalar run from p, writing at out + written (kWrite) or only counting; written grows.
+template <bool kStrict, bool kWrite>
+inline utf8::RunEnd ScalarRun(const std::uint8_t*& p, const std::uint8_t* end,
+                              const std::uint8_t* limit, char16_t* out, std::size_t& written,
+                              bool final, bool stopAtAscii) {
+  if constexpr (kWrite) {
+    utf8::UnitWriter sink{out + written};
+    const utf8::RunEnd r = utf8::DecodeRun<kStrict>(p, end, limit, sink, final, stopAtAscii);
+    written = static_cast<std::size_t>(sink.out - out);
+    return r;
+  } else {
+    utf8::UnitCounter sink;
+    const utf8::RunEnd r = utf8::DecodeRun<kStrict>(p, end, limit, sink, final, stopAtAscii);
+    written += sink.count;
+    return r;
+  }
+}
+
 // kWrite: out receives the units (room for n); otherwise they are only counted.
 template <bool kStrict, bool kWrite>
 VYN_TARGET_AVX2 TranscodeResult DecodeLoopAvx2(const std::uint8_t* s, std::size_t n, char16_t* out,
@@ -205,7 +223,8 @@ VYN_TARGET_AVX2 TranscodeResult DecodeLoopAvx2(const std::uint8_t* s, std::size_
   bool lastWasAscii = false;
   while (end - p >= 16) {
     const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p));
-    if (_mm_movemask_epi8(v) == 0) {
+    const unsigned high = static_cast<unsigned>(_mm_movemask_epi8(v));
+    if (high == 0) {
       if (kWrite) {
         _mm256_storeu_si256(reinterpret_cast<__m256i*>(out + written), _mm256_cvtepu8_epi16(v));
       }
@@ -222,6 +241,21 @@ VYN_TARGET_AVX2 TranscodeResult DecodeLoopAvx2(const std::uint8_t* s, std::size_
       continue;
     }
     lastWasAscii = false;
+    if (__builtin_popcount(high) <= 3) {
+      // Mostly ASCII (Western text): the ASCII prefix, then the few characters after it one by
+      // one, up to the next ASCII byte; cheaper than the full kernel.
+      const unsigned k = static_cast<unsigned>(__builtin_ctz(high));
+      if (kWrite) {
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(out + written), _mm256_cvtepu8_epi16(v));
+      }
+      p += k;
+      written += k;
+      const utf8::RunEnd r = ScalarRun<kStrict, kWrite>(p, end, end, out, written, final, true);
+      if (r != utf8::RunEnd::kDone) {
+        return {static_cast<std::size_t>(p - s), written, r == utf8::RunEnd::kInvalid};
+      }
+      continue;
+    }
     unsigned units;
     const unsigned taken = DecodeBlock16<kWrite>(p, kWrite ? out + written : nullptr, &units);
     if (taken != 0) {
@@ -232,30 +266,12 @@ VYN_TARGET_AVX2 TranscodeResult DecodeLoopAvx2(const std::uint8_t* s, std::size_
     // 4-byte sequences or invalid input: the scalar run. Text with one of them usually has more
     // (emoji), so the run covers several blocks before the kernel is tried again.
     const std::uint8_t* const limit = end - p > 64 ? p + 64 : end;
-    utf8::RunEnd r;
-    if (kWrite) {
-      utf8::UnitWriter sink{out + written};
-      r = utf8::DecodeRun<kStrict>(p, end, limit, sink, final, false);
-      written = static_cast<std::size_t>(sink.out - out);
-    } else {
-      utf8::UnitCounter sink;
-      r = utf8::DecodeRun<kStrict>(p, end, limit, sink, final, false);
-      written += sink.count;
-    }
+    const utf8::RunEnd r = ScalarRun<kStrict, kWrite>(p, end, limit, out, written, final, false);
     if (r != utf8::RunEnd::kDone) {
       return {static_cast<std::size_t>(p - s), written, r == utf8::RunEnd::kInvalid};
     }
   }
-  utf8::RunEnd r;
-  if (kWrite) {
-    utf8::UnitWriter sink{out + written};
-    r = utf8::DecodeRun<kStrict>(p, end, end, sink, final, false);
-    written = static_cast<std::size_t>(sink.out - out);
-  } else {
-    utf8::UnitCounter sink;
-    r = utf8::DecodeRun<kStrict>(p, end, end, sink, final, false);
-    written += sink.count;
-  }
+  const utf8::RunEnd r = ScalarRun<kStrict, kWrite>(p, end, end, out, written, final, false);
   if (r != utf8::RunEnd::kDone) {
     return {static_cast<std::size_t>(p - s), written, r == utf8::RunEnd::kInvalid};
   }

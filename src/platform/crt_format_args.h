@@ -30,6 +30,9 @@ class VaListArguments {
     // The same as va_copy, one field at a time: the caller has usually just stored the fields
     // one by one (va_start), and the single wide load va_copy compiles to cannot take its value
     // from those stores; that stall alone costs about what formatting "%d" does.
+    // The barrier makes the compiler finish writing the caller's list (va_start) before the
+    // fields are read, even where this is inlined into the function that called va_start.
+    __asm__ volatile("" : : "r"(args) : "memory");
     const volatile Fields* source = reinterpret_cast<const volatile Fields*>(&args[0]);
     Fields* target = reinterpret_cast<Fields*>(&args_[0]);
     target->gpOffset = source->gpOffset;

@@ -44,6 +44,18 @@ void WalkUtf32(const unsigned int* src, std::size_t srcCount, Emit emit) {
   }
 }
 
+// The common end of both converters: 0 and ERROR_INSUFFICIENT_BUFFER when the output did not
+// fit; otherwise the units written, with a terminator after them when a place is left.
+template <class Unit>
+std::size_t FinishConversion(bool overflow, Unit* dst, std::size_t written, std::size_t dstCount) {
+  if (overflow) {
+    win32::SetLastError(win32::ERROR_INSUFFICIENT_BUFFER);
+    return 0;
+  }
+  if (written < dstCount) dst[written] = 0;
+  return written;
+}
+
 }  // namespace
 
 std::size_t UTF32ToWideChar(const unsigned int* src, std::size_t srcCount, MCHAR* dst, std::size_t dstCount) {
@@ -68,12 +80,7 @@ std::size_t UTF32ToWideChar(const unsigned int* src, std::size_t srcCount, MCHAR
     for (unsigned k = 0; k < n; ++k) dst[written++] = units[k];
     return true;
   });
-  if (overflow) {
-    win32::SetLastError(win32::ERROR_INSUFFICIENT_BUFFER);
-    return 0;
-  }
-  if (written < dstCount) dst[written] = 0;
-  return written;
+  return FinishConversion(overflow, dst, written, dstCount);
 }
 
 std::size_t WideCharToUTF32(const MCHAR* src, std::size_t srcCount, unsigned int* dst, std::size_t dstCount) {
@@ -96,12 +103,7 @@ std::size_t WideCharToUTF32(const MCHAR* src, std::size_t srcCount, unsigned int
     dst[written++] = c;
     return true;
   });
-  if (overflow) {
-    win32::SetLastError(win32::ERROR_INSUFFICIENT_BUFFER);
-    return 0;
-  }
-  if (written < dstCount) dst[written] = 0;
-  return written;
+  return FinishConversion(overflow, dst, written, dstCount);
 }
 
 }  // namespace VynSDK::Util

@@ -1,7 +1,7 @@
 // CStr, WStr and UTF8Str: formatted printing with the Windows runtime's printf rules.
 //
-// The output is measured first, then formatted into a new block of exactly that size, which
-// becomes the string's text only when the formatting succeeds; on a null or invalid format the
+// The output is formatted into a new block of exactly its size, which becomes the string's text
+// only when the formatting succeeds; on a null or invalid format the
 // string keeps its text and the negative result is returned.
 //
 // Narrow output is text of the narrow code page, and the block is tagged so: without a locale of
@@ -10,6 +10,7 @@
 // into the active one.
 
 #include <cstdarg>
+#include <cstring>
 
 #include "strings/str_core.h"
 #include "vynutil/strclass.h"
@@ -51,6 +52,9 @@ struct FormatterOf<NarrowText> {
   using Type = NarrowFormatter;
 };
 
+// Units formatted on the stack before a block is made.
+constexpr std::size_t kStackUnits = 256;
+
 // Formats into a new block of Text's encoding; on success buf holds it. Returns the formatter's
 // result (the units written, or negative).
 template <class Text>
@@ -58,6 +62,20 @@ int Print(typename Text::Unit*& buf, const typename Text::Unit* format, _locale_
   using Core = StrCore<Text>;
   using Formatter = typename FormatterOf<Text>::Type;
   if (!format) return -1;
+  // Most output is short: format once on the stack and copy the result into a block of its exact
+  // size. Output that does not fit (or an invalid format) takes the measuring path below, which
+  // gives the same text and result.
+  typename Text::Unit stack[kStackUnits];
+  va_list stackArgs;
+  va_copy(stackArgs, args);
+  const int quick = Formatter::Format(stack, kStackUnits, format, locale, stackArgs);
+  va_end(stackArgs);
+  if (quick >= 0) {
+    typename Text::Unit* fresh = Core::NewBuffer(static_cast<std::size_t>(quick) + 1);
+    std::memcpy(fresh, stack, (static_cast<std::size_t>(quick) + 1) * sizeof(stack[0]));
+    Core::Replace(buf, fresh);
+    return quick;
+  }
   va_list measureArgs;
   va_copy(measureArgs, args);
   const int count = Formatter::Measure(format, locale, measureArgs);

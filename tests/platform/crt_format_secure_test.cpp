@@ -177,6 +177,27 @@ TEST(CrtFormatSecure, TheCallersVaListIsNeverAdvanced) {
             u"a 1 2 3 4 5 6 b 0.500000");
 }
 
+// Reads the same list twice through the argument source, in the function that called
+// va_start, where the compiler sees the list being made and copied at once.
+long long ReadTwice(int count, ...) {
+  va_list args;
+  va_start(args, count);
+  long long total = 0;
+  for (int pass = 0; pass < 2; ++pass) {
+    detail::VaListArguments source(args);
+    for (int i = 0; i < count; ++i) total += source.Int();
+    total += static_cast<long long>(source.Double() * 10) + source.LongLong();
+    total += static_cast<long long>(source.LongDouble()) + *source.NarrowText() + *source.WideText();
+  }
+  va_end(args);
+  return total;
+}
+
+TEST(CrtFormatSecure, TheArgumentSourceCopiesTheListWhereVaStartIsCalled) {
+  EXPECT_EQ(ReadTwice(9, 1, 2, 3, 4, 5, 6, 7, 8, 9, 1.5, 100LL, 1000.0L, "a", u"b"),
+            2 * (45 + 15 + 100 + 1000 + 'a' + 'b'));
+}
+
 TEST(CrtFormatSecure, ArrayArgumentsAnswerEveryRequestSafely) {
   using detail::ArgumentArray;
   const std::uint64_t words[] = {42, 1, 0x3FF8000000000000ULL /* 1.5 */, 0};
