@@ -55,7 +55,9 @@ void Check(const std::vector<Char>& format, std::size_t size, _locale_t locale, 
                                                         _TRUNCATE, format.data(), locale, args);
     Require(written == measured);
     Require(whole[static_cast<std::size_t>(measured)] == 0);
-    for (std::size_t i = static_cast<std::size_t>(measured) + 1; i < whole.size(); ++i) Require(whole[i] == Char{0x55});
+    for (std::size_t i = static_cast<std::size_t>(measured) + 1; i < whole.size(); ++i) {
+      Require(whole[i] == Char{0x55});
+    }
   }
 
   // The same into a small buffer: truncating, then with a count that makes overflow an error.

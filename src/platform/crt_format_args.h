@@ -89,7 +89,9 @@ class ArrayArguments {
   long double LongDouble() noexcept { return Double(); }
   const char* NarrowText() noexcept { return (Next() & 1) != 0 ? array_.narrowText : nullptr; }
   const MCHAR* WideText() noexcept { return (Next() & 1) != 0 ? array_.wideText : nullptr; }
-  const void* Pointer() noexcept { return reinterpret_cast<const void*>(static_cast<std::uintptr_t>(Next())); }
+  const void* Pointer() noexcept {
+    return reinterpret_cast<const void*>(static_cast<std::uintptr_t>(Next()));
+  }
 
  private:
   std::uint64_t Next() noexcept { return next_ < array_.count ? array_.words[next_++] : 0; }

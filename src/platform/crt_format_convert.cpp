@@ -52,7 +52,8 @@ std::size_t WholeCharacterUnits(const MCHAR* s, std::size_t n) noexcept {
 long long WideLengthOfNarrow(const FormatLocale& locale, const char* s, std::size_t n) noexcept {
   if (n == 0) return 0;
   if (n > INT_MAX) return -1;
-  const int units = MultiByteToWideChar(locale.CodePage(), MB_ERR_INVALID_CHARS, s, static_cast<int>(n), nullptr, 0);
+  const int units =
+      MultiByteToWideChar(locale.CodePage(), MB_ERR_INVALID_CHARS, s, static_cast<int>(n), nullptr, 0);
   return units > 0 ? units : -1;
 }
 

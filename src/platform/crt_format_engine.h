@@ -12,7 +12,7 @@
 #include "crt_format_float.h"
 #include "crt_format_integer.h"
 #include "crt_format_locale.h"
-#include "crt_format_spec.h"
+#include "crt_format_conversion.h"
 #include "crt_format_text.h"
 
 namespace win32::detail {
@@ -32,12 +32,13 @@ const Char* NextDirective(const Char* p) noexcept {
 
 // %e %E %f %F %g %G %a %A: a double, or a long double with L (printed as a double).
 template <typename Sink, typename Arguments>
-void WriteFloat(Sink& sink, const ConversionSpec& spec, const FormatLocale& locale, Arguments& args) {
+void WriteFloat(Sink& sink, const Conversion& conversion, const FormatLocale& locale, Arguments& args) {
   const double value =
-      spec.size == SizePrefix::kBigL ? static_cast<double>(args.LongDouble()) : args.Double();
+      conversion.size == SizePrefix::kBigL ? static_cast<double>(args.LongDouble()) : args.Double();
   char scratch[kFloatScratchSize];
   FloatText text;
-  FormatFloat(value, spec.type, spec.precision, {spec.plus, spec.space, spec.alt},
+  const FloatFlags flags{conversion.plus, conversion.space, conversion.alt};
+  FormatFloat(value, conversion.type, conversion.precision, flags,
               locale.DecimalPoint(), scratch, &text);
   NumberPieces n;
   n.sign = text.sign;
@@ -45,35 +46,35 @@ void WriteFloat(Sink& sink, const ConversionSpec& spec, const FormatLocale& loca
   n.body = text.body;
   n.trailingZeros = text.zeros;
   n.exponent = text.exponent;
-  n.zeroPad = spec.zero && text.finite;  // infinities and NaNs are padded with spaces
-  WriteNumber(sink, spec, n);
+  n.zeroPad = conversion.zero && text.finite;  // infinities and NaNs are padded with spaces
+  WriteNumber(sink, conversion, n);
 }
 
 // One conversion, by its type character.
 template <typename Char, typename Sink, typename Arguments>
-FormatStatus WriteConversion(Sink& sink, ConversionSpec& spec, const FormatLocale& locale,
+FormatStatus WriteConversion(Sink& sink, Conversion& conversion, const FormatLocale& locale,
                              Arguments& args) {
-  switch (spec.type) {
+  switch (conversion.type) {
     case 'd':
     case 'i':
     case 'u':
     case 'o':
     case 'x':
     case 'X': {
-      const bool isSigned = spec.type == 'd' || spec.type == 'i';
+      const bool isSigned = conversion.type == 'd' || conversion.type == 'i';
       std::uint64_t magnitude;
       bool negative;
-      if (!ReadInteger(args, spec.size, isSigned, &magnitude, &negative)) {
+      if (!ReadInteger(args, conversion.size, isSigned, &magnitude, &negative)) {
         return FormatStatus::kInvalidFormat;
       }
-      WriteInteger(sink, spec, magnitude, negative, isSigned, spec.type);
+      WriteInteger(sink, conversion, magnitude, negative, isSigned, conversion.type);
       return FormatStatus::kOk;
     }
     case 'p': {
       // All the digits of a 64-bit address in upper case, no prefix (0X with '#').
       const auto address = reinterpret_cast<std::uintptr_t>(args.Pointer());
-      spec.precision = 2 * sizeof(void*);
-      WriteInteger(sink, spec, address, false, false, 'X');
+      conversion.precision = 2 * sizeof(void*);
+      WriteInteger(sink, conversion, address, false, false, 'X');
       return FormatStatus::kOk;
     }
     case 'e':
@@ -84,15 +85,15 @@ FormatStatus WriteConversion(Sink& sink, ConversionSpec& spec, const FormatLocal
     case 'G':
     case 'a':
     case 'A':
-      WriteFloat(sink, spec, locale, args);
+      WriteFloat(sink, conversion, locale, args);
       return FormatStatus::kOk;
     case 'c':
     case 'C':
-      WriteCharacter<Char>(sink, spec, IsWideArgument<Char>(spec), locale, args);
+      WriteCharacter<Char>(sink, conversion, IsWideArgument<Char>(conversion), locale, args);
       return FormatStatus::kOk;
     case 's':
     case 'S':
-      return WriteString<Char>(sink, spec, IsWideArgument<Char>(spec), locale, args);
+      return WriteString<Char>(sink, conversion, IsWideArgument<Char>(conversion), locale, args);
     default:
       return FormatStatus::kInvalidFormat;  // %n, %Z and anything unknown
   }
@@ -115,9 +116,9 @@ FormatStatus FormatToSink(const Char* format, const FormatLocale& locale, Argume
       ++p;
       continue;
     }
-    ConversionSpec spec;
-    if (!ParseConversionSpec(p, args, &spec)) return FormatStatus::kInvalidFormat;
-    const FormatStatus status = engine::WriteConversion<Char>(sink, spec, locale, args);
+    Conversion conversion;
+    if (!ParseConversion(p, args, &conversion)) return FormatStatus::kInvalidFormat;
+    const FormatStatus status = engine::WriteConversion<Char>(sink, conversion, locale, args);
     if (status != FormatStatus::kOk) return status;
   }
 }

@@ -6,20 +6,20 @@
 #include <cstdint>
 #include <string_view>
 
-#include "crt_format_spec.h"
+#include "crt_format_conversion.h"
 
 namespace win32::detail::engine {
 
 // Pads a field of `length` units around what body() writes: spaces before it, or '0's when the
-// spec has '0' and zeros are allowed, or spaces after it with '-'. The runtime pads strings and
+// conversion has '0' and zeros are allowed, or spaces after it with '-'. The runtime pads strings and
 // characters with '0' too.
 template <typename Sink, typename Body>
-void WritePadded(Sink& sink, const ConversionSpec& spec, std::uint64_t length, Body&& body) {
-  const std::uint64_t width = static_cast<std::uint64_t>(spec.width);
+void WritePadded(Sink& sink, const Conversion& conversion, std::uint64_t length, Body&& body) {
+  const std::uint64_t width = static_cast<std::uint64_t>(conversion.width);
   const std::uint64_t pad = width > length ? width - length : 0;
-  if (!spec.left) sink.Fill(spec.zero ? '0' : ' ', pad);
+  if (!conversion.left) sink.Fill(conversion.zero ? '0' : ' ', pad);
   body();
-  if (spec.left) sink.Fill(' ', pad);
+  if (conversion.left) sink.Fill(' ', pad);
 }
 
 // A number: [spaces] sign/prefix [zeros for '0'] leading zeros, body, trailing zeros,
@@ -35,13 +35,13 @@ struct NumberPieces {
 };
 
 template <typename Sink>
-void WriteNumber(Sink& sink, const ConversionSpec& spec, const NumberPieces& n) {
+void WriteNumber(Sink& sink, const Conversion& conversion, const NumberPieces& n) {
   const std::uint64_t length = n.sign.size() + n.prefix.size() + n.leadingZeros + n.body.size() +
                                n.trailingZeros + n.exponent.size();
-  const std::uint64_t width = static_cast<std::uint64_t>(spec.width);
+  const std::uint64_t width = static_cast<std::uint64_t>(conversion.width);
   const std::uint64_t pad = width > length ? width - length : 0;
-  const bool zeroPad = n.zeroPad && !spec.left;
-  if (pad != 0 && !spec.left && !zeroPad) sink.Fill(' ', pad);
+  const bool zeroPad = n.zeroPad && !conversion.left;
+  if (pad != 0 && !conversion.left && !zeroPad) sink.Fill(' ', pad);
   if (!n.sign.empty()) sink.Put(static_cast<unsigned char>(n.sign[0]));
   if (!n.prefix.empty()) sink.AppendAscii(n.prefix.data(), n.prefix.size());
   if (pad != 0 && zeroPad) sink.Fill('0', pad);
@@ -49,7 +49,7 @@ void WriteNumber(Sink& sink, const ConversionSpec& spec, const NumberPieces& n) 
   sink.AppendAscii(n.body.data(), n.body.size());
   if (n.trailingZeros != 0) sink.Fill('0', n.trailingZeros);
   if (!n.exponent.empty()) sink.AppendAscii(n.exponent.data(), n.exponent.size());
-  if (pad != 0 && spec.left) sink.Fill(' ', pad);
+  if (pad != 0 && conversion.left) sink.Fill(' ', pad);
 }
 
 }  // namespace win32::detail::engine

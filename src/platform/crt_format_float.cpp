@@ -29,7 +29,7 @@ char Upper(char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + '
 
 // The runtime's names: "inf", "nan" (quiet), "nan(snan)" (signalling) and "nan(ind)" for the
 // indefinite value, the negative quiet NaN without payload that invalid operations produce.
-std::string_view SpecialName(std::uint64_t bits, bool upper) {
+std::string_view NonFiniteName(std::uint64_t bits, bool upper) {
   const std::uint64_t mantissa = bits & kMantissaMask;
   const bool negative = (bits >> 63) != 0;
   if (mantissa == 0) return upper ? "INF" : "inf";
@@ -138,7 +138,7 @@ void FormatFloat(double value, char type, int precision, FloatFlags flags, char 
   text->exponent = {};
 
   if (!std::isfinite(value)) {
-    text->body = SpecialName(bits, upper);
+    text->body = NonFiniteName(bits, upper);
     text->finite = false;
     return;
   }

@@ -8,7 +8,7 @@
 #include <string_view>
 
 #include "crt_format_field.h"
-#include "crt_format_spec.h"
+#include "crt_format_conversion.h"
 
 namespace win32::detail::engine {
 
@@ -79,32 +79,32 @@ std::string_view IntegerDigits(std::uint64_t magnitude, char type, char* end) no
 }
 
 template <typename Sink>
-void WriteInteger(Sink& sink, const ConversionSpec& spec, std::uint64_t magnitude, bool negative,
+void WriteInteger(Sink& sink, const Conversion& conversion, std::uint64_t magnitude, bool negative,
                   bool isSigned, char type) {
   char buffer[24];
   char* const end = buffer + sizeof(buffer);
   NumberPieces n;
-  if (isSigned) n.sign = negative ? "-" : spec.plus ? "+" : spec.space ? " " : "";
-  if (magnitude != 0 || spec.precision != 0) {  // "%.0d" prints no digits for 0
+  if (isSigned) n.sign = negative ? "-" : conversion.plus ? "+" : conversion.space ? " " : "";
+  if (magnitude != 0 || conversion.precision != 0) {  // "%.0d" prints no digits for 0
     n.body = IntegerDigits<Sink>(magnitude, type, end);
   }
-  if (spec.width == 0 && spec.precision < 0 && !spec.alt) {  // the common plain case
+  if (conversion.width == 0 && conversion.precision < 0 && !conversion.alt) {  // the common plain case
     if (!n.sign.empty()) sink.Put(static_cast<unsigned char>(n.sign[0]));
     sink.AppendAscii(n.body.data(), n.body.size());
     return;
   }
-  if (spec.alt && magnitude != 0 && (type == 'x' || type == 'X')) n.prefix = type == 'x' ? "0x" : "0X";
+  if (conversion.alt && magnitude != 0 && (type == 'x' || type == 'X')) n.prefix = type == 'x' ? "0x" : "0X";
   const auto digits = static_cast<std::uint64_t>(n.body.size());
-  const auto precision = static_cast<std::uint64_t>(spec.precision < 0 ? 1 : spec.precision);
+  const auto precision = static_cast<std::uint64_t>(conversion.precision < 0 ? 1 : conversion.precision);
   n.leadingZeros = precision > digits ? precision - digits : 0;
-  if (spec.alt && type == 'o' && n.leadingZeros == 0 && (digits == 0 || magnitude != 0)) {
+  if (conversion.alt && type == 'o' && n.leadingZeros == 0 && (digits == 0 || magnitude != 0)) {
     n.leadingZeros = 1;  // '#' makes the first octal digit a 0
   }
-  n.zeroPad = spec.zero && spec.precision < 0;  // a precision turns the '0' flag off
-  WriteNumber(sink, spec, n);
+  n.zeroPad = conversion.zero && conversion.precision < 0;  // a precision turns the '0' flag off
+  WriteNumber(sink, conversion, n);
 }
 
-// Reads an integer argument of the spec's size. False for sizes integers do not take.
+// Reads an integer argument of the conversion's size. False for sizes integers do not take.
 template <typename Arguments>
 bool ReadInteger(Arguments& args, SizePrefix size, bool isSigned, std::uint64_t* magnitude,
                  bool* negative) {

@@ -12,7 +12,7 @@
 #include "crt_format_convert.h"
 #include "crt_format_field.h"
 #include "crt_format_locale.h"
-#include "crt_format_spec.h"
+#include "crt_format_conversion.h"
 
 namespace win32::detail::engine {
 
@@ -69,25 +69,25 @@ void AppendConverted(Sink& sink, std::size_t units, Convert&& convert) {
 
 // %s/%S: text of the format's own kind, or of the other kind converted with the code page.
 template <typename Char, typename Sink, typename Arguments>
-FormatStatus WriteString(Sink& sink, const ConversionSpec& spec, bool wideArgument,
+FormatStatus WriteString(Sink& sink, const Conversion& conversion, bool wideArgument,
                          const FormatLocale& locale, Arguments& args) {
   constexpr bool kWideFormat = sizeof(Char) == 2;
   if (wideArgument == kWideFormat) {
     const Char* text;
     if constexpr (kWideFormat) text = args.WideText(); else text = args.NarrowText();
     if (text == nullptr) text = NullText<Char>();
-    const std::size_t n = TextLength(text, spec.precision);
-    WritePadded(sink, spec, n, [&] { sink.Append(text, n); });
+    const std::size_t n = TextLength(text, conversion.precision);
+    WritePadded(sink, conversion, n, [&] { sink.Append(text, n); });
     return FormatStatus::kOk;
   }
   if constexpr (kWideFormat) {  // narrow text into MCHAR output
     const char* text = args.NarrowText();
     if (text == nullptr) text = NullText<char>();
-    std::size_t n = TextLength(text, spec.precision);
-    if (spec.precision >= 0 && text[n] != 0) n = WholeCharacterBytes(locale, text, n);
+    std::size_t n = TextLength(text, conversion.precision);
+    if (conversion.precision >= 0 && text[n] != 0) n = WholeCharacterBytes(locale, text, n);
     const long long units = WideLengthOfNarrow(locale, text, n);
     if (units < 0) return FormatStatus::kUnconvertible;
-    WritePadded(sink, spec, static_cast<std::uint64_t>(units), [&] {
+    WritePadded(sink, conversion, static_cast<std::uint64_t>(units), [&] {
       AppendConverted<MCHAR>(sink, static_cast<std::size_t>(units), [&](MCHAR* out) {
         NarrowToWide(locale, text, n, out, static_cast<std::size_t>(units));
       });
@@ -95,11 +95,11 @@ FormatStatus WriteString(Sink& sink, const ConversionSpec& spec, bool wideArgume
   } else {  // MCHAR text into narrow output
     const MCHAR* text = args.WideText();
     if (text == nullptr) text = NullText<MCHAR>();
-    std::size_t n = TextLength(text, spec.precision);
-    if (spec.precision >= 0 && text[n] != 0) n = WholeCharacterUnits(text, n);
+    std::size_t n = TextLength(text, conversion.precision);
+    if (conversion.precision >= 0 && text[n] != 0) n = WholeCharacterUnits(text, n);
     const long long bytes = NarrowLengthOfWide(locale, text, n);
     if (bytes < 0) return FormatStatus::kUnconvertible;
-    WritePadded(sink, spec, static_cast<std::uint64_t>(bytes), [&] {
+    WritePadded(sink, conversion, static_cast<std::uint64_t>(bytes), [&] {
       AppendConverted<char>(sink, static_cast<std::size_t>(bytes), [&](char* out) {
         WideToNarrow(locale, text, n, out, static_cast<std::size_t>(bytes));
       });
@@ -111,7 +111,7 @@ FormatStatus WriteString(Sink& sink, const ConversionSpec& spec, bool wideArgume
 // %c/%C. A character the code page cannot convert is left out, padding and all, as the
 // runtime does.
 template <typename Char, typename Sink, typename Arguments>
-void WriteCharacter(Sink& sink, const ConversionSpec& spec, bool wideArgument,
+void WriteCharacter(Sink& sink, const Conversion& conversion, bool wideArgument,
                     const FormatLocale& locale, Arguments& args) {
   constexpr bool kWideFormat = sizeof(Char) == 2;
   const int value = args.Int();
@@ -125,7 +125,7 @@ void WriteCharacter(Sink& sink, const ConversionSpec& spec, bool wideArgument,
     n = static_cast<std::size_t>(WideCharToNarrow(locale, static_cast<MCHAR>(value), out));
     if (n == 0) return;
   }
-  WritePadded(sink, spec, n, [&] {
+  WritePadded(sink, conversion, n, [&] {
     for (std::size_t i = 0; i < n; ++i) sink.Put(out[i]);
   });
 }
@@ -133,10 +133,10 @@ void WriteCharacter(Sink& sink, const ConversionSpec& spec, bool wideArgument,
 // Whether a %c/%s/%C/%S argument is wide: h narrow, l and w wide, otherwise by the letter and
 // the format's kind (lower case: the format's own kind).
 template <typename Char>
-bool IsWideArgument(const ConversionSpec& spec) {
-  if (spec.size == SizePrefix::kH) return false;
-  if (spec.size == SizePrefix::kL || spec.size == SizePrefix::kW) return true;
-  const bool ownKind = spec.type == 'c' || spec.type == 's';
+bool IsWideArgument(const Conversion& conversion) {
+  if (conversion.size == SizePrefix::kH) return false;
+  if (conversion.size == SizePrefix::kL || conversion.size == SizePrefix::kW) return true;
+  const bool ownKind = conversion.type == 'c' || conversion.type == 's';
   return ownKind == (sizeof(Char) == 2);
 }
 

@@ -1,5 +1,5 @@
 #pragma once
-// One conversion specification of a printf format: %[flags][width][.precision][size]type, with
+// One conversion of a printf format, %[flags][width][.precision][size]type, with
 // the Windows runtime's size prefixes (hh h l ll L I I32 I64 j z t w). Widths and precisions
 // given as '*' are read from the arguments here, in the order the runtime reads them.
 
@@ -17,7 +17,7 @@ enum class FormatStatus {
 
 enum class SizePrefix : std::uint8_t { kNone, kHH, kH, kL, kLL, kBigL, kI, kI32, kI64, kJ, kZ, kT, kW };
 
-struct ConversionSpec {
+struct Conversion {
   bool left = false;   // '-'
   bool plus = false;   // '+'
   bool space = false;  // ' '
@@ -42,18 +42,18 @@ bool ParseFormatNumber(const Char*& p, int* value) noexcept {
   return true;
 }
 
-// Parses the specification after a '%' and leaves p after its type character. False for a
-// number out of range or a format that ends inside the specification; the type character
+// Parses the conversion after a '%' and leaves p after its type character. False for a
+// number out of range or a format that ends inside the conversion; the type character
 // itself is checked by the engine.
 template <typename Char, typename Arguments>
-bool ParseConversionSpec(const Char*& p, Arguments& args, ConversionSpec* spec) noexcept {
+bool ParseConversion(const Char*& p, Arguments& args, Conversion* conversion) noexcept {
   for (;; ++p) {
     switch (*p) {
-      case '-': spec->left = true; continue;
-      case '+': spec->plus = true; continue;
-      case ' ': spec->space = true; continue;
-      case '#': spec->alt = true; continue;
-      case '0': spec->zero = true; continue;
+      case '-': conversion->left = true; continue;
+      case '+': conversion->plus = true; continue;
+      case ' ': conversion->space = true; continue;
+      case '#': conversion->alt = true; continue;
+      case '0': conversion->zero = true; continue;
       default: break;
     }
     break;
@@ -63,12 +63,12 @@ bool ParseConversionSpec(const Char*& p, Arguments& args, ConversionSpec* spec) 
     ++p;
     const int width = args.Int();
     if (width < 0) {  // a negative width argument means '-' and its magnitude
-      spec->left = true;
-      spec->width = width == INT_MIN ? INT_MAX : -width;
+      conversion->left = true;
+      conversion->width = width == INT_MIN ? INT_MAX : -width;
     } else {
-      spec->width = width;
+      conversion->width = width;
     }
-  } else if (!ParseFormatNumber(p, &spec->width)) {
+  } else if (!ParseFormatNumber(p, &conversion->width)) {
     return false;
   }
 
@@ -77,8 +77,8 @@ bool ParseConversionSpec(const Char*& p, Arguments& args, ConversionSpec* spec) 
     if (*p == '*') {
       ++p;
       const int precision = args.Int();
-      spec->precision = precision < 0 ? -1 : precision;  // a negative one counts as none
-    } else if (!ParseFormatNumber(p, &spec->precision)) {
+      conversion->precision = precision < 0 ? -1 : precision;  // a negative one counts as none
+    } else if (!ParseFormatNumber(p, &conversion->precision)) {
       return false;
     }
   }
@@ -86,36 +86,36 @@ bool ParseConversionSpec(const Char*& p, Arguments& args, ConversionSpec* spec) 
   switch (*p) {
     case 'h':
       ++p;
-      spec->size = *p == 'h' ? (++p, SizePrefix::kHH) : SizePrefix::kH;
+      conversion->size = *p == 'h' ? (++p, SizePrefix::kHH) : SizePrefix::kH;
       break;
     case 'l':
       ++p;
-      spec->size = *p == 'l' ? (++p, SizePrefix::kLL) : SizePrefix::kL;
+      conversion->size = *p == 'l' ? (++p, SizePrefix::kLL) : SizePrefix::kL;
       break;
     case 'I':
       ++p;
       if (p[0] == '6' && p[1] == '4') {
         p += 2;
-        spec->size = SizePrefix::kI64;
+        conversion->size = SizePrefix::kI64;
       } else if (p[0] == '3' && p[1] == '2') {
         p += 2;
-        spec->size = SizePrefix::kI32;
+        conversion->size = SizePrefix::kI32;
       } else {
-        spec->size = SizePrefix::kI;
+        conversion->size = SizePrefix::kI;
       }
       break;
-    case 'L': ++p; spec->size = SizePrefix::kBigL; break;
-    case 'j': ++p; spec->size = SizePrefix::kJ; break;
-    case 'z': ++p; spec->size = SizePrefix::kZ; break;
-    case 't': ++p; spec->size = SizePrefix::kT; break;
-    case 'w': ++p; spec->size = SizePrefix::kW; break;
+    case 'L': ++p; conversion->size = SizePrefix::kBigL; break;
+    case 'j': ++p; conversion->size = SizePrefix::kJ; break;
+    case 'z': ++p; conversion->size = SizePrefix::kZ; break;
+    case 't': ++p; conversion->size = SizePrefix::kT; break;
+    case 'w': ++p; conversion->size = SizePrefix::kW; break;
     default: break;
   }
 
   const Char type = *p;
   if (type == 0) return false;
   ++p;
-  spec->type = static_cast<std::uint32_t>(type) < 0x80 ? static_cast<char>(type) : 0;
+  conversion->type = static_cast<std::uint32_t>(type) < 0x80 ? static_cast<char>(type) : 0;
   return true;
 }
 
