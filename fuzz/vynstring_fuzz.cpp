@@ -18,14 +18,15 @@ const UINT kEncodings[] = {CP_UTF8, CP_UTF16, CP_UTF32, CP_NEUTRAL, 1252, 932, 9
 VynString Make(UINT encoding, const uint8_t* data, size_t size) {
   switch (encoding) {
     case CP_UTF16: {
-      std::vector<MCHAR> units(size / 2);
-      std::memcpy(units.data(), data, units.size() * 2);
-      return VynString::FromUTF16(units.data(), units.size());
+      // One unit more than the input fills, so that even empty input has a (non-null) text.
+      std::vector<MCHAR> units(size / 2 + 1);
+      std::memcpy(units.data(), data, size / 2 * 2);
+      return VynString::FromUTF16(units.data(), size / 2);
     }
     case CP_UTF32: {
-      std::vector<unsigned int> units(size / 4);
-      std::memcpy(units.data(), data, units.size() * 4);
-      return VynString::FromUTF32(units.data(), units.size());
+      std::vector<unsigned int> units(size / 4 + 1);
+      std::memcpy(units.data(), data, size / 4 * 4);
+      return VynString::FromUTF32(units.data(), size / 4);
     }
     default: return VynString::FromCP(encoding, reinterpret_cast<const char*>(data), size);
   }

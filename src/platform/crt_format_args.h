@@ -25,24 +25,7 @@ namespace win32::detail {
 // Reads a private copy of a va_list, so the caller's list is never advanced.
 class VaListArguments {
  public:
-  explicit VaListArguments(va_list args) noexcept {
-#if defined(__x86_64__)
-    // The same as va_copy, one field at a time: the caller has usually just stored the fields
-    // one by one (va_start), and the single wide load va_copy compiles to cannot take its value
-    // from those stores; that stall alone costs about what formatting "%d" does.
-    // The barrier makes the compiler finish writing the caller's list (va_start) before the
-    // fields are read, even where this is inlined into the function that called va_start.
-    __asm__ volatile("" : : "r"(args) : "memory");
-    const volatile Fields* source = reinterpret_cast<const volatile Fields*>(&args[0]);
-    Fields* target = reinterpret_cast<Fields*>(&args_[0]);
-    target->gpOffset = source->gpOffset;
-    target->fpOffset = source->fpOffset;
-    target->overflowArea = source->overflowArea;
-    target->registerArea = source->registerArea;
-#else
-    va_copy(args_, args);
-#endif
-  }
+  explicit VaListArguments(va_list args) noexcept { va_copy(args_, args); }
   ~VaListArguments() { va_end(args_); }
   VaListArguments(const VaListArguments&) = delete;
   VaListArguments& operator=(const VaListArguments&) = delete;
@@ -56,16 +39,6 @@ class VaListArguments {
   const void* Pointer() noexcept { return va_arg(args_, const void*); }
 
  private:
-#if defined(__x86_64__)
-  // The x86-64 System V va_list element; may_alias lets it stand for the compiler's own type.
-  struct __attribute__((may_alias)) Fields {
-    unsigned gpOffset;
-    unsigned fpOffset;
-    void* overflowArea;
-    void* registerArea;
-  };
-  static_assert(sizeof(Fields) == sizeof(va_list));
-#endif
   va_list args_;
 };
 

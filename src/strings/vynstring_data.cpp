@@ -171,7 +171,8 @@ EncodedForm* MakeUtf16(const ChainScan& scan) {
 }
 
 // UTF-8 takes up to three bytes a unit. Short text is converted on the stack and copied into a
-// form of its exact size; long text is measured first, so no form is ever made three times too big.
+// form of its exact size; long text is measured first (with the converter's few bytes of room for
+// its vector stores), so no form is ever made three times too big.
 EncodedForm* MakeUtf8(const MCHAR* src, std::size_t n) {
   constexpr std::size_t kStackUnits = 512;
   if (n <= kStackUnits) {
@@ -183,7 +184,7 @@ EncodedForm* MakeUtf8(const MCHAR* src, std::size_t n) {
     return form;
   }
   std::size_t bytes = win32::text::Utf16ToUtf8Length(src, n);
-  EncodedForm* form = NewForm(CP_UTF8, bytes + 1);
+  EncodedForm* form = NewForm(CP_UTF8, bytes + 1 + win32::text::kUtf8WriteSlack);
   win32::text::Utf16ToUtf8(src, n, form->Chars());
   form->Chars()[bytes] = 0;
   return form;

@@ -98,7 +98,10 @@ VYN_API std::size_t Utf8ToUtf16(const char* s, std::size_t n, MCHAR* out) noexce
 // The units Utf8ToUtf16 would write.
 VYN_API std::size_t Utf8ToUtf16Length(const char* s, std::size_t n) noexcept;
 
-// UTF-16 -> UTF-8; lone surrogates become U+FFFD (EF BF BD). out must have room for 3n bytes.
+// UTF-16 -> UTF-8; lone surrogates become U+FFFD (EF BF BD). out must have room for 3n bytes,
+// or for the measured length (Utf16ToUtf8Length) plus kUtf8WriteSlack: the vector paths store
+// whole 16-byte blocks and may write up to that many bytes past the end of the result.
+inline constexpr std::size_t kUtf8WriteSlack = 16;
 VYN_API std::size_t Utf16ToUtf8(const MCHAR* s, std::size_t n, char* out) noexcept;
 // The bytes Utf16ToUtf8 would write.
 VYN_API std::size_t Utf16ToUtf8Length(const MCHAR* s, std::size_t n) noexcept;
