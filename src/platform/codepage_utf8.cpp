@@ -174,6 +174,18 @@ TranscodeResult EncodeUtf8(const char16_t* s, std::size_t n, char* out, bool str
   return strict ? EncodeLoop<true>(s, n, out, final) : EncodeLoop<false>(s, n, out, final);
 }
 
+namespace {
+
+// The sum of the eight unsigned 16-bit lanes.
+inline std::size_t SumLanes(__m128i lanes) noexcept {
+  const __m128i pairs = _mm_madd_epi16(lanes, _mm_set1_epi16(1));  // lanes stay below 2^15
+  const __m128i halves = _mm_add_epi32(pairs, _mm_shuffle_epi32(pairs, _MM_SHUFFLE(1, 0, 3, 2)));
+  const __m128i total = _mm_add_epi32(halves, _mm_shuffle_epi32(halves, _MM_SHUFFLE(2, 3, 0, 1)));
+  return static_cast<std::uint32_t>(_mm_cvtsi128_si32(total));
+}
+
+}  // namespace
+
 CountResult CountUtf16AsUtf8(const char16_t* s, std::size_t n, bool strict) noexcept {
   // Per eight units without surrogates: one byte each, one more from U+0080, one more from
   // U+0800. Blocks with surrogates are counted character by character.
@@ -182,6 +194,9 @@ CountResult CountUtf16AsUtf8(const char16_t* s, std::size_t n, bool strict) noex
   const __m128i above7FF = _mm_set1_epi16(static_cast<short>(0x87FF));
   const __m128i surrogateMask = _mm_set1_epi16(static_cast<short>(0xF800));
   const __m128i surrogate = _mm_set1_epi16(static_cast<short>(0xD800));
+  constexpr unsigned kStepsPerFlush = 8192;  // keeps every lane below 2^15
+  __m128i extra = _mm_setzero_si128();
+  unsigned steps = 0;
   std::size_t count = 0;
   std::size_t i = 0;
   while (i + 8 <= n) {
@@ -198,14 +213,20 @@ CountResult CountUtf16AsUtf8(const char16_t* s, std::size_t n, bool strict) noex
       }
       continue;
     }
+    // Each lane counts its extra bytes (0, 1 or 2) in 16 bits; the lanes are summed before
+    // they could overflow (at most 2 a step) and at the end.
     const __m128i signedV = _mm_xor_si128(v, flip);
-    const unsigned ge80 =
-        static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpgt_epi16(signedV, above7F)));
-    const unsigned ge800 =
-        static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpgt_epi16(signedV, above7FF)));
-    count += 8 + static_cast<std::size_t>(__builtin_popcount(ge80) + __builtin_popcount(ge800)) / 2;
+    extra = _mm_sub_epi16(extra, _mm_cmpgt_epi16(signedV, above7F));
+    extra = _mm_sub_epi16(extra, _mm_cmpgt_epi16(signedV, above7FF));
+    count += 8;
     i += 8;
+    if (++steps == kStepsPerFlush) {
+      count += SumLanes(extra);
+      extra = _mm_setzero_si128();
+      steps = 0;
+    }
   }
+  count += SumLanes(extra);
   while (i < n) {
     std::size_t units;
     const std::size_t bytes = Utf8LengthOf(s + i, s + n, strict, &units);
