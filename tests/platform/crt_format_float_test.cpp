@@ -2,7 +2,7 @@
 // the digits of every finite value checked against glibc's printf, whose rounding (exact,
 // ties to even) the runtime shares.
 //
-// Sources: "Format specification syntax: printf and wprintf functions" (Microsoft C runtime
+// Sources: the printf and wprintf format-syntax page (Microsoft C runtime
 // documentation) [syntax]: the type field table, the table of infinity/NaN outputs
 // ("inf", "nan", "nan(snan)", "nan(ind)", capitals for capital type characters), the note that
 // exponents have at least two digits, "Default precision is 13" for a/A, and the width section

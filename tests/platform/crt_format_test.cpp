@@ -4,10 +4,10 @@
 // and that measuring leaves the caller's list where it was.
 //
 // Sources of expected values:
-//   [syntax] "Format specification syntax: printf and wprintf functions" (Microsoft C runtime
+//   [syntax] the printf and wprintf format-syntax page (Microsoft C runtime
 //            documentation: type field characters, flag directives, width, precision, size
 //            prefixes);
-//   [size]   its "Argument size specification" table (hh h l ll j z t I I32 I64, h/l/w on c s);
+//   [size]   its argument-size table (hh h l ll j z t I I32 I64, h/l/w on c s);
 //   [C]      ISO C 7.21.6.1 where the runtime follows it.
 
 #include "win32/crt_format.h"

@@ -1,5 +1,5 @@
 // CStr, WStr and UTF8Str: formatted printing. Results and texts as the Windows runtime's
-// _vsnwprintf_s / _vsnprintf_s give them (learn.microsoft.com, "Format specification syntax").
+// _vsnwprintf_s / _vsnprintf_s give them (learn.microsoft.com, the printf format-syntax page).
 
 #include <gtest/gtest.h>
 
