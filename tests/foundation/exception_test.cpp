@@ -8,6 +8,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <tuple>
 #include <type_traits>
 #include <vector>
 
@@ -21,44 +22,32 @@ using VynSDK::Util::RunTimeException;
 std::u16string Text(const MCHAR* text) { return text != nullptr ? text : u"(null)"; }
 
 // The base's message-less form is protected; a derived test class reaches it.
-struct BareException : Exception {
-  BareException() = default;
-};
+struct BareException : Exception {};
 
-// One vtable pointer and the message pointer, nothing else.
-static_assert(sizeof(Exception) == 2 * sizeof(void*));
-static_assert(sizeof(OutOfRangeException) == sizeof(Exception));
-static_assert(std::has_virtual_destructor_v<Exception>);
-static_assert(std::is_base_of_v<VynHeapOperators, Exception>);
-static_assert(!std::is_base_of_v<std::exception, Exception>);
-static_assert(std::is_base_of_v<Exception, NullDereferenceException> &&
-              std::is_base_of_v<Exception, OutOfRangeException> &&
-              std::is_base_of_v<Exception, RunTimeException>);
+// Binary layout: one vtable pointer and the message pointer, nothing else.
+static_assert(sizeof(Exception) == 2 * sizeof(void*) &&
+              sizeof(OutOfRangeException) == sizeof(Exception));
+static_assert(std::has_virtual_destructor_v<Exception> &&
+              std::is_base_of_v<VynHeapOperators, Exception>);
+
+template <class T>
+std::unique_ptr<Exception> Make(const MCHAR* message) {
+  return std::make_unique<T>(message);
+}
 
 TEST(Exceptions, WhatGivesTheMessageOrTheClassFallback) {
-  struct Row {
-    const char* name;
-    std::function<std::unique_ptr<Exception>(const MCHAR*)> make;
-    const MCHAR* fallback;
+  const std::vector<std::tuple<decltype(&Make<Exception>), const MCHAR*>> rows = {
+      {Make<Exception>, u"Unknown Exception"},
+      {Make<NullDereferenceException>, u"VynSDK::Util::NullDereferenceException"},
+      {Make<OutOfRangeException>, u"VynSDK::Util::OutOfRangeException"},
+      {Make<RunTimeException>, u"VynSDK::Util::RunTimeException"},
   };
-  const std::vector<Row> rows = {
-      {"Exception", [](const MCHAR* m) { return std::make_unique<Exception>(m); },
-       u"Unknown Exception"},
-      {"NullDereferenceException",
-       [](const MCHAR* m) { return std::make_unique<NullDereferenceException>(m); },
-       u"VynSDK::Util::NullDereferenceException"},
-      {"OutOfRangeException",
-       [](const MCHAR* m) { return std::make_unique<OutOfRangeException>(m); },
-       u"VynSDK::Util::OutOfRangeException"},
-      {"RunTimeException", [](const MCHAR* m) { return std::make_unique<RunTimeException>(m); },
-       u"VynSDK::Util::RunTimeException"},
-  };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.name);
-    EXPECT_EQ(Text(row.make(nullptr)->What()), row.fallback);
+  for (const auto& [make, fallback] : rows) {
+    SCOPED_TRACE(std::string(fallback, fallback + std::char_traits<MCHAR>::length(fallback)));
+    EXPECT_EQ(Text(make(nullptr)->What()), fallback);
     // An empty message is a message: its text is returned, not the fallback.
-    EXPECT_EQ(Text(row.make(u"")->What()), u"");
-    EXPECT_EQ(Text(row.make(u"Größe ≠ 𝄞")->What()), u"Größe ≠ 𝄞");
+    EXPECT_EQ(Text(make(u"")->What()), u"");
+    EXPECT_EQ(Text(make(u"Größe ≠ 𝄞")->What()), u"Größe ≠ 𝄞");
   }
   EXPECT_EQ(Text(BareException().What()), u"Unknown Exception");
 }
@@ -75,24 +64,17 @@ TEST(Exceptions, TheMessageIsACopyOwnedByEachObject) {
   delete doomed;
   EXPECT_EQ(Text(copy.What()), u"first");
 
-  RunTimeException source2(u"moved");
-  RunTimeException target(std::move(source2));
-  EXPECT_EQ(Text(source2.What()), u"moved") << "moving copies: the source keeps its message";
+  RunTimeException moved(u"moved");
+  RunTimeException target(std::move(moved));
+  EXPECT_EQ(Text(moved.What()), u"moved") << "moving copies: the source keeps its message";
   EXPECT_EQ(Text(target.What()), u"moved");
-  EXPECT_NE(source2.What(), target.What());
-
-  Exception base(u"base");
-  Exception baseCopy(base);
-  EXPECT_EQ(Text(baseCopy.What()), u"base");
-  EXPECT_NE(baseCopy.What(), base.What());
+  EXPECT_NE(moved.What(), target.What());
 }
 
 TEST(Exceptions, AssignmentKeepsTheMessageWhenTheOtherHasNone) {
   NullDereferenceException a(u"A");
-  const NullDereferenceException none(nullptr);
-  a = none;
+  a = NullDereferenceException(nullptr);
   EXPECT_EQ(Text(a.What()), u"A");
-
   const MCHAR* before = a.What();
   a = a;
   EXPECT_EQ(a.What(), before) << "self-assignment changes nothing";
@@ -101,10 +83,6 @@ TEST(Exceptions, AssignmentKeepsTheMessageWhenTheOtherHasNone) {
   a = b;
   EXPECT_EQ(Text(a.What()), u"B");
   EXPECT_NE(a.What(), b.What());
-
-  a = NullDereferenceException(u"C");  // move assignment copies as well
-  EXPECT_EQ(Text(a.What()), u"C");
-
   NullDereferenceException empty(nullptr);
   empty = b;
   EXPECT_EQ(Text(empty.What()), u"B");
@@ -129,11 +107,8 @@ TEST(Exceptions, CaughtByTheirBasesButNotByStdException) {
     return u"not thrown";
   };
   EXPECT_EQ(throwAndCatch([] { throw OutOfRangeException(u"range"); }), u"range");
-  EXPECT_EQ(throwAndCatch([] { throw NullDereferenceException(nullptr); }),
-            u"VynSDK::Util::NullDereferenceException");
   EXPECT_EQ(throwAndCatch([] { throw RunTimeException(nullptr); }),
             u"VynSDK::Util::RunTimeException");
-
   try {
     throw OutOfRangeException(u"exact");
   } catch (const RunTimeException&) {
@@ -141,7 +116,6 @@ TEST(Exceptions, CaughtByTheirBasesButNotByStdException) {
   } catch (const OutOfRangeException& e) {
     EXPECT_EQ(Text(e.What()), u"exact");
   }
-
   // Thrown by pointer, as the string core does: the catcher owns and deletes the object.
   try {
     throw new RunTimeException(u"by pointer");

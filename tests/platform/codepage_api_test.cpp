@@ -7,7 +7,6 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <functional>
 #include <string>
 
 #include "win32/codepage.h"
@@ -17,118 +16,73 @@ namespace {
 
 using namespace win32;
 
-struct ErrorRow {
-  const char* name;
-  std::function<int()> call;
-  DWORD error;
-};
-
-void ExpectFailures(const ErrorRow* rows, std::size_t count) {
-  for (std::size_t i = 0; i < count; ++i) {
-    SCOPED_TRACE(rows[i].name);
-    SetLastError(0);
-    EXPECT_EQ(rows[i].call(), 0);
-    EXPECT_EQ(GetLastError(), rows[i].error);
-  }
-}
+// The call fails (returns 0) with the given last error.
+#define EXPECT_FAILS_WITH(call, error)   \
+  do {                                     \
+    SetLastError(0);                       \
+    EXPECT_EQ(call, 0);                    \
+    EXPECT_EQ(GetLastError(), DWORD(error)); \
+  } while (0)
 
 TEST(CodePageApi, MultiByteToWideCharErrors) {
-  static MCHAR wide[16];
-  static char shared[32] = "abcdefgh";
-  const ErrorRow rows[] = {
-      {"null source", [] { return MultiByteToWideChar(1252, 0, nullptr, 3, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"zero length", [] { return MultiByteToWideChar(1252, 0, "abc", 0, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"length -2", [] { return MultiByteToWideChar(1252, 0, "abc", -2, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"negative output size", [] { return MultiByteToWideChar(1252, 0, "abc", 3, wide, -1); },
-       ERROR_INVALID_PARAMETER},
-      {"null output with a size", [] { return MultiByteToWideChar(1252, 0, "abc", 3, nullptr, 4); },
-       ERROR_INVALID_PARAMETER},
-      {"same buffer",
-       [] { return MultiByteToWideChar(1252, 0, shared, 4, reinterpret_cast<MCHAR*>(shared), 8); },
-       ERROR_INVALID_PARAMETER},
-      {"overlapping buffers",
-       [] {
-         return MultiByteToWideChar(1252, 0, shared + 6, 4, reinterpret_cast<MCHAR*>(shared), 8);
-       },
-       ERROR_INVALID_PARAMETER},
-      {"unknown code page", [] { return MultiByteToWideChar(12345, 0, "abc", 3, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"CP_UTF16 is no platform code page",
-       [] { return MultiByteToWideChar(CP_UTF16, 0, "abc", 3, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"CP_NEUTRAL", [] { return MultiByteToWideChar(CP_NEUTRAL, 0, "abc", 3, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"CP_UTF32", [] { return MultiByteToWideChar(CP_UTF32, 0, "abc", 3, wide, 16); },
-       ERROR_INVALID_PARAMETER},
-      {"precomposed and composite",
-       [] { return MultiByteToWideChar(1252, MB_PRECOMPOSED | MB_COMPOSITE, "a", 1, wide, 16); },
-       ERROR_INVALID_FLAGS},
-      {"unknown flag", [] { return MultiByteToWideChar(1252, 0x100, "a", 1, wide, 16); },
-       ERROR_INVALID_FLAGS},
-      {"UTF-8 takes only MB_ERR_INVALID_CHARS",
-       [] { return MultiByteToWideChar(CP_UTF8, MB_PRECOMPOSED, "a", 1, wide, 16); },
-       ERROR_INVALID_FLAGS},
-      {"buffer too small", [] { return MultiByteToWideChar(1252, 0, "abc", 3, wide, 2); },
-       ERROR_INSUFFICIENT_BUFFER},
-  };
-  ExpectFailures(rows, std::size(rows));
+  MCHAR wide[16];
+  char shared[32] = "abcdefgh";
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, nullptr, 3, wide, 16), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, "abc", 0, wide, 16), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, "abc", -2, wide, 16), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, "abc", 3, wide, -1), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, "abc", 3, nullptr, 4), ERROR_INVALID_PARAMETER);
+  // The same or overlapping buffers.
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, shared, 4, reinterpret_cast<MCHAR*>(shared), 8),
+                    ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, shared + 6, 4, reinterpret_cast<MCHAR*>(shared), 8),
+                    ERROR_INVALID_PARAMETER);
+  // Unknown code pages, and the ones that are no platform code page.
+  for (UINT cp : {12345u, CP_UTF16, CP_NEUTRAL, CP_UTF32}) {
+    EXPECT_FAILS_WITH(MultiByteToWideChar(cp, 0, "abc", 3, wide, 16), ERROR_INVALID_PARAMETER);
+  }
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, MB_PRECOMPOSED | MB_COMPOSITE, "a", 1, wide, 16),
+                    ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0x100, "a", 1, wide, 16), ERROR_INVALID_FLAGS);
+  // UTF-8 takes only MB_ERR_INVALID_CHARS.
+  EXPECT_FAILS_WITH(MultiByteToWideChar(CP_UTF8, MB_PRECOMPOSED, "a", 1, wide, 16), ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(1252, 0, "abc", 3, wide, 2), ERROR_INSUFFICIENT_BUFFER);
+  // Windows takes no flags for the stateful code pages.
+  EXPECT_FAILS_WITH(MultiByteToWideChar(50222, MB_ERR_INVALID_CHARS, "a", 1, wide, 8), ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(CP_UTF7, MB_PRECOMPOSED, "a", 1, wide, 8), ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(50222, 0, "\x1B$B\x30\x21\x30\x21", 8, wide, 1), ERROR_INSUFFICIENT_BUFFER);
 }
 
 TEST(CodePageApi, WideCharToMultiByteErrors) {
-  static char narrow[16];
-  static MCHAR shared[16] = u"abcdefgh";
-  static BOOL used;
-  const ErrorRow rows[] = {
-      {"null source",
-       [] { return WideCharToMultiByte(1252, 0, nullptr, 3, narrow, 16, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"zero length",
-       [] { return WideCharToMultiByte(1252, 0, u"abc", 0, narrow, 16, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"length -5",
-       [] { return WideCharToMultiByte(1252, 0, u"abc", -5, narrow, 16, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"negative output size",
-       [] { return WideCharToMultiByte(1252, 0, u"abc", 3, narrow, -3, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"null output with a size",
-       [] { return WideCharToMultiByte(1252, 0, u"abc", 3, nullptr, 3, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"overlapping buffers",
-       [] {
-         return WideCharToMultiByte(1252, 0, shared, 4, reinterpret_cast<char*>(shared) + 2, 8,
-                                    nullptr, nullptr);
-       },
-       ERROR_INVALID_PARAMETER},
-      {"UTF-8 with a default character",
-       [] { return WideCharToMultiByte(CP_UTF8, 0, u"a", 1, narrow, 16, "?", nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"UTF-8 with a used-default flag",
-       [] { return WideCharToMultiByte(CP_UTF8, 0, u"a", 1, narrow, 16, nullptr, &used); },
-       ERROR_INVALID_PARAMETER},
-      {"UTF-8 with WC_NO_BEST_FIT_CHARS",
-       [] {
-         return WideCharToMultiByte(CP_UTF8, WC_NO_BEST_FIT_CHARS, u"a", 1, narrow, 16, nullptr,
-                                    nullptr);
-       },
-       ERROR_INVALID_FLAGS},
-      {"WC_ERR_INVALID_CHARS is for UTF-8 only",
-       [] {
-         return WideCharToMultiByte(1252, WC_ERR_INVALID_CHARS, u"a", 1, narrow, 16, nullptr,
-                                    nullptr);
-       },
-       ERROR_INVALID_FLAGS},
-      {"CP_UTF16",
-       [] { return WideCharToMultiByte(CP_UTF16, 0, u"a", 1, narrow, 16, nullptr, nullptr); },
-       ERROR_INVALID_PARAMETER},
-      {"buffer too small",
-       [] { return WideCharToMultiByte(1252, 0, u"abc", 3, narrow, 2, nullptr, nullptr); },
-       ERROR_INSUFFICIENT_BUFFER},
-  };
-  ExpectFailures(rows, std::size(rows));
+  char narrow[16];
+  MCHAR shared[16] = u"abcdefgh";
+  BOOL used;
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, nullptr, 3, narrow, 16, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, u"abc", 0, narrow, 16, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, u"abc", -5, narrow, 16, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, u"abc", 3, narrow, -3, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, u"abc", 3, nullptr, 3, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(
+      WideCharToMultiByte(1252, 0, shared, 4, reinterpret_cast<char*>(shared) + 2, 8, nullptr, nullptr),
+      ERROR_INVALID_PARAMETER);
+  // UTF-8 takes no default character, no used-default flag and no WC_NO_BEST_FIT_CHARS;
+  // WC_ERR_INVALID_CHARS is for UTF-8 only.
+  EXPECT_FAILS_WITH(WideCharToMultiByte(CP_UTF8, 0, u"a", 1, narrow, 16, "?", nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(CP_UTF8, 0, u"a", 1, narrow, 16, nullptr, &used), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(CP_UTF8, WC_NO_BEST_FIT_CHARS, u"a", 1, narrow, 16, nullptr, nullptr),
+                    ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, WC_ERR_INVALID_CHARS, u"a", 1, narrow, 16, nullptr, nullptr),
+                    ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(CP_UTF16, 0, u"a", 1, narrow, 16, nullptr, nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(1252, 0, u"abc", 3, narrow, 2, nullptr, nullptr), ERROR_INSUFFICIENT_BUFFER);
+  // A buffer one byte short of a double-byte character.
+  EXPECT_FAILS_WITH(WideCharToMultiByte(932, 0, u"a\u3042", 2, narrow, 2, nullptr, nullptr), ERROR_INSUFFICIENT_BUFFER);
+  EXPECT_FAILS_WITH(MultiByteToWideChar(932, 0, "\x82\xA0\x82\xA2", 4, shared, 1), ERROR_INSUFFICIENT_BUFFER);
+  // The stateful code pages take no flags, default character or used-default report.
+  EXPECT_FAILS_WITH(WideCharToMultiByte(50225, 0, u"a", 1, narrow, 8, nullptr, &used), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(CP_UTF7, 0, u"a", 1, narrow, 8, "?", nullptr), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(WideCharToMultiByte(50222, WC_NO_BEST_FIT_CHARS, u"a", 1, narrow, 8, nullptr, nullptr),
+                    ERROR_INVALID_FLAGS);
 }
 
 TEST(CodePageApi, TerminatorsAndMeasuring) {
@@ -182,12 +136,8 @@ TEST(CodePageApi, CodePageQueries) {
   for (UINT cp : {CP_UTF16, CP_NEUTRAL, CP_UTF32, 1200u, 9999u, 65002u}) {
     EXPECT_FALSE(IsValidCodePage(cp)) << cp;
     CPINFO info;
-    SetLastError(0);
-    EXPECT_FALSE(GetCPInfo(cp, &info)) << cp;
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
-    SetLastError(0);
-    EXPECT_FALSE(IsDBCSLeadByteEx(cp, 0x81)) << cp;
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    EXPECT_FAILS_WITH(GetCPInfo(cp, &info), ERROR_INVALID_PARAMETER);
+    EXPECT_FAILS_WITH(IsDBCSLeadByteEx(cp, 0x81), ERROR_INVALID_PARAMETER);
   }
   CPINFO info;
   ASSERT_TRUE(GetCPInfo(1252, &info));

@@ -12,7 +12,6 @@
 
 #include <random>
 #include <string>
-#include <vector>
 
 #include "win32/codepage.h"
 #include "win32/last_error.h"
@@ -43,6 +42,7 @@ std::string IcuToUtf8(const std::u16string& s) {
   return out;
 }
 
+// The fast functions, with their measuring twins checked against the converted length.
 std::u16string FastToUtf16(const std::string& s) {
   std::u16string out(s.size(), u'\0');
   out.resize(text::Utf8ToUtf16(s.data(), s.size(), out.data()));
@@ -57,37 +57,42 @@ std::string FastToUtf8(const std::u16string& s) {
   return out;
 }
 
-// MultiByteToWideChar(CP_UTF8) measured, then converted into a buffer of exactly that size.
+// The Win32 calls, measured, then converted into a buffer of exactly that size.
 std::u16string Win32ToUtf16(const std::string& s, DWORD flags = 0) {
   const int n = static_cast<int>(s.size());
-  const int needed = MultiByteToWideChar(CP_UTF8, flags, s.data(), n, nullptr, 0);
-  std::u16string out(needed, u'\0');
-  if (needed > 0) {
-    EXPECT_EQ(MultiByteToWideChar(CP_UTF8, flags, s.data(), n, out.data(), needed), needed);
+  std::u16string out(MultiByteToWideChar(CP_UTF8, flags, s.data(), n, nullptr, 0), u'\0');
+  if (!out.empty()) {
+    EXPECT_EQ(MultiByteToWideChar(CP_UTF8, flags, s.data(), n, out.data(), out.size()), out.size());
   }
   return out;
 }
 
 std::string Win32ToUtf8(const std::u16string& s, DWORD flags = 0) {
   const int n = static_cast<int>(s.size());
-  const int needed = WideCharToMultiByte(CP_UTF8, flags, s.data(), n, nullptr, 0, nullptr, nullptr);
-  std::string out(needed, '\0');
-  if (needed > 0) {
-    EXPECT_EQ(
-        WideCharToMultiByte(CP_UTF8, flags, s.data(), n, out.data(), needed, nullptr, nullptr),
-        needed);
+  std::string out(WideCharToMultiByte(CP_UTF8, flags, s.data(), n, nullptr, 0, nullptr, nullptr), '\0');
+  if (!out.empty()) {
+    EXPECT_EQ(WideCharToMultiByte(CP_UTF8, flags, s.data(), n, out.data(), out.size(), nullptr, nullptr),
+              out.size());
   }
   return out;
 }
 
-struct DecodeRow {
-  const char* name;
-  std::string bytes;
-  std::u16string expected;
-};
+// A strict conversion (MB_ERR_INVALID_CHARS / WC_ERR_INVALID_CHARS) measures valid text and
+// fails invalid text with ERROR_NO_UNICODE_TRANSLATION.
+void ExpectStrict(int strict, bool valid, std::size_t length) {
+  EXPECT_EQ(strict, valid ? static_cast<int>(length) : 0);
+  if (!valid) {
+    EXPECT_EQ(GetLastError(), ERROR_NO_UNICODE_TRANSLATION);
+  }
+}
 
 TEST(CodePageUtf8, ReplacementRules) {
-  const DecodeRow rows[] = {
+  struct Row {
+    const char* name;
+    std::string bytes;
+    std::u16string expected;
+  };
+  const Row rows[] = {
       {"ascii", "abc", u"abc"},
       {"two byte", "\xC3\xA9", u"\u00E9"},
       {"three byte", "\xE2\x82\xAC", u"\u20AC"},
@@ -106,11 +111,10 @@ TEST(CodePageUtf8, ReplacementRules) {
       {"overlong three byte", "\xE0\x80\x80", u"\uFFFD\uFFFD\uFFFD"},
       {"overlong four byte", "\xF0\x80\x80\x80", u"\uFFFD\uFFFD\uFFFD\uFFFD"},
       {"surrogate D800 encoded", "\xED\xA0\x80", u"\uFFFD\uFFFD\uFFFD"},
-      {"surrogate pair encoded (CESU-8)", "\xED\xA0\xBD\xED\xB8\x80",
-       u"\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD"},
+      {"surrogate pair encoded (CESU-8)", "\xED\xA0\xBD\xED\xB8\x80", std::u16string(6, u'\uFFFD')},
       {"above U+10FFFF", "\xF4\x90\x80\x80", u"\uFFFD\uFFFD\uFFFD\uFFFD"},
       {"F5 lead", "\xF5\x80\x80\x80", u"\uFFFD\uFFFD\uFFFD\uFFFD"},
-      {"five byte form", "\xF8\x88\x80\x80\x80", u"\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD"},
+      {"five byte form", "\xF8\x88\x80\x80\x80", std::u16string(5, u'\uFFFD')},
       {"stray continuation", "a\x80z", u"a\uFFFDz"},
       {"stray continuations", "\x80\xBF\x80", u"\uFFFD\uFFFD\uFFFD"},
       {"FE and FF", "\xFE\xFF", u"\uFFFD\uFFFD"},
@@ -118,36 +122,28 @@ TEST(CodePageUtf8, ReplacementRules) {
       {"three byte with bad third", "\xE2\x82\x28", u"\uFFFD("},
       {"embedded NUL", std::string("a\0b", 3), std::u16string(u"a\0b", 3)},
   };
-  for (const DecodeRow& row : rows) {
+  for (const Row& row : rows) {
     SCOPED_TRACE(row.name);
     EXPECT_EQ(FastToUtf16(row.bytes), row.expected);
     EXPECT_EQ(Win32ToUtf16(row.bytes), row.expected);
     EXPECT_EQ(IcuFromUtf8(row.bytes), row.expected);  // the reference agrees with the table
     // Long enough for the vector paths, at an odd offset.
-    const std::string padded = std::string(37, 'x') + row.bytes + std::string(21, 'y');
-    EXPECT_EQ(FastToUtf16(padded),
-              u"xxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxxx" + row.expected + u"yyyyyyyyyyyyyyyyyyyyy");
-    const bool valid = row.expected.find(u'\uFFFD') == std::u16string::npos;
+    EXPECT_EQ(FastToUtf16(std::string(37, 'x') + row.bytes + std::string(21, 'y')),
+              std::u16string(37, u'x') + row.expected + std::u16string(21, u'y'));
     SetLastError(0);
-    const int strict = MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, row.bytes.data(),
-                                           static_cast<int>(row.bytes.size()), nullptr, 0);
-    if (valid) {
-      EXPECT_EQ(strict, static_cast<int>(row.expected.size()));
-    } else {
-      EXPECT_EQ(strict, 0);
-      EXPECT_EQ(GetLastError(), ERROR_NO_UNICODE_TRANSLATION);
-    }
+    ExpectStrict(MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, row.bytes.data(),
+                                     static_cast<int>(row.bytes.size()), nullptr, 0),
+                 row.expected.find(u'\uFFFD') == std::u16string::npos, row.expected.size());
   }
 }
 
-struct EncodeRow {
-  const char* name;
-  std::u16string units;
-  std::string expected;
-};
-
 TEST(CodePageUtf8, LoneSurrogatesBecomeReplacementCharacters) {
-  const EncodeRow rows[] = {
+  struct Row {
+    const char* name;
+    std::u16string units;
+    std::string expected;
+  };
+  const Row rows[] = {
       {"pair", u"\U0001F600", "\xF0\x9F\x98\x80"},
       {"lone lead at end", u"a\xD83D", "a\xEF\xBF\xBD"},
       {"lone lead before ASCII", u"\xD83Dz", "\xEF\xBF\xBDz"},
@@ -157,148 +153,104 @@ TEST(CodePageUtf8, LoneSurrogatesBecomeReplacementCharacters) {
       {"U+FFFF", u"\uFFFF", "\xEF\xBF\xBF"},
       {"U+07FF and U+0800", u"\u07FF\u0800", "\xDF\xBF\xE0\xA0\x80"},
   };
-  for (const EncodeRow& row : rows) {
+  for (const Row& row : rows) {
     SCOPED_TRACE(row.name);
     EXPECT_EQ(FastToUtf8(row.units), row.expected);
     EXPECT_EQ(Win32ToUtf8(row.units), row.expected);
     EXPECT_EQ(IcuToUtf8(row.units), row.expected);
-    const std::u16string padded = std::u16string(19, u'x') + row.units + std::u16string(40, u'y');
-    EXPECT_EQ(FastToUtf8(padded), std::string(19, 'x') + row.expected + std::string(40, 'y'));
-    const bool valid = row.expected.find("\xEF\xBF\xBD") == std::string::npos;
+    EXPECT_EQ(FastToUtf8(std::u16string(19, u'x') + row.units + std::u16string(40, u'y')),
+              std::string(19, 'x') + row.expected + std::string(40, 'y'));
     SetLastError(0);
-    const int strict =
-        WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, row.units.data(),
-                            static_cast<int>(row.units.size()), nullptr, 0, nullptr, nullptr);
-    EXPECT_EQ(strict, valid ? static_cast<int>(row.expected.size()) : 0);
-    if (!valid) {
-      EXPECT_EQ(GetLastError(), ERROR_NO_UNICODE_TRANSLATION);
-    }
+    ExpectStrict(WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, row.units.data(),
+                                     static_cast<int>(row.units.size()), nullptr, 0, nullptr, nullptr),
+                 row.expected.find("\xEF\xBF\xBD") == std::string::npos, row.expected.size());
   }
 }
 
 // Text made of pieces chosen to hit every path: ASCII runs of every length around the vector
 // widths, 2-, 3- and 4-byte characters, and broken sequences.
 std::string RandomUtf8(std::mt19937& rng, bool corrupt) {
-  static const char* const kPieces[] = {"a",
-                                        "0123456789abcdef",
-                                        "0123456789abcdefghijklmnopqrstuv",
-                                        "\xC3\xA9",
-                                        "\xD0\x96",
-                                        "\xE2\x82\xAC",
-                                        "\xE6\x97\xA5\xE6\x9C\xAC",
-                                        "\xF0\x9F\x98\x80",
-                                        "\xEF\xBF\xBD",
-                                        " ",
-                                        "\n"};
-  static const char* const kBroken[] = {
-      "\x80",        "\xC3",         "\xE2\x82",         "\xF0\x9F\x98",
-      "\xC0\xAF",    "\xED\xA0\x80", "\xF4\x90\x80\x80", "\xFF",
-      "\xE0\x9F\xBF"};
+  static const char* const kPieces[] = {"a", "0123456789abcdef", "0123456789abcdefghijklmnopqrstuv",
+                                        "\xC3\xA9", "\xD0\x96", "\xE2\x82\xAC", "\xE6\x97\xA5\xE6\x9C\xAC",
+                                        "\xF0\x9F\x98\x80", "\xEF\xBF\xBD", " ", "\n"};
+  static const char* const kBroken[] = {"\x80", "\xC3", "\xE2\x82", "\xF0\x9F\x98", "\xC0\xAF",
+                                        "\xED\xA0\x80", "\xF4\x90\x80\x80", "\xFF", "\xE0\x9F\xBF"};
   std::string s;
   const int pieces = std::uniform_int_distribution<int>(0, 40)(rng);
   for (int i = 0; i < pieces; ++i) {
-    if (corrupt && rng() % 5 == 0)
-      s += kBroken[rng() % std::size(kBroken)];
-    else
-      s += kPieces[rng() % std::size(kPieces)];
+    s += corrupt && rng() % 5 == 0 ? kBroken[rng() % std::size(kBroken)] : kPieces[rng() % std::size(kPieces)];
   }
   return s;
 }
 
 TEST(CodePageUtf8, AgreesWithIcuAndWin32OnRandomText) {
   std::mt19937 rng(20240601);
-  for (int round = 0; round < 3000; ++round) {
-    std::string s;
-    switch (round % 3) {
-      case 0: s = RandomUtf8(rng, false); break;
-      case 1: s = RandomUtf8(rng, true); break;
-      default:
-        s.resize(rng() % 200);
-        for (char& c : s) c = static_cast<char>(rng());
-        break;
-    }
-    const std::u16string expected = IcuFromUtf8(s);
-    ASSERT_EQ(FastToUtf16(s), expected) << "round " << round;
-    if (!s.empty()) {
-      ASSERT_EQ(Win32ToUtf16(s), expected) << "round " << round;
-    }
-    // And back: the UTF-16 text (now valid) round-trips.
-    ASSERT_EQ(FastToUtf16(FastToUtf8(expected)), expected);
-    ASSERT_EQ(FastToUtf8(expected), IcuToUtf8(expected));
-  }
-}
-
-TEST(CodePageUtf8, RandomUtf16AgreesWithIcu) {
-  std::mt19937 rng(77);
   static const char16_t kUnits[] = {u'a',   u'Z',   0x7F,   0x80,   0x7FF,  0x800,  0x20AC, 0xD7FF,
                                     0xD800, 0xDBFF, 0xDC00, 0xDFFF, 0xE000, 0xFFFD, 0xFFFF};
   for (int round = 0; round < 3000; ++round) {
-    std::u16string s(rng() % 150, u'\0');
-    for (char16_t& c : s) c = rng() % 3 ? kUnits[rng() % std::size(kUnits)] : char16_t(rng());
-    const std::string expected = IcuToUtf8(s);
-    ASSERT_EQ(FastToUtf8(s), expected) << "round " << round;
+    SCOPED_TRACE(round);
+    std::string s;
+    if (round % 3 == 2) {
+      s.resize(rng() % 200);
+      for (char& c : s) c = static_cast<char>(rng());
+    } else {
+      s = RandomUtf8(rng, round % 3 == 1);
+    }
+    const std::u16string expected = IcuFromUtf8(s);
+    ASSERT_EQ(FastToUtf16(s), expected);
     if (!s.empty()) {
-      ASSERT_EQ(Win32ToUtf8(s), expected) << "round " << round;
+      ASSERT_EQ(Win32ToUtf16(s), expected);
+    }
+    ASSERT_EQ(FastToUtf16(FastToUtf8(expected)), expected);  // the (now valid) text round-trips
+
+    // UTF-16 with lone surrogates.
+    std::u16string units(rng() % 150, u'\0');
+    for (char16_t& c : units) c = rng() % 3 ? kUnits[rng() % std::size(kUnits)] : char16_t(rng());
+    const std::string bytes = IcuToUtf8(units);
+    ASSERT_EQ(FastToUtf8(units), bytes);
+    if (!units.empty()) {
+      ASSERT_EQ(Win32ToUtf8(units), bytes);
     }
   }
 }
 
-// Every buffer size from 0 to the needed size: exactly the needed size succeeds, anything
-// smaller fails with ERROR_INSUFFICIENT_BUFFER and writes nothing past the buffer.
-TEST(CodePageUtf8, BufferSizesAroundTheNeededSize) {
-  const std::string bytes =
-      "ab\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80" + std::string(40, 'q') + "\xE6\x97\xA5\xC3";
-  const std::u16string units = FastToUtf16(bytes);
-  const int n = static_cast<int>(bytes.size());
-  const int needed = static_cast<int>(units.size());
+// Every buffer size from 1 past the needed size: the needed size or more succeeds, anything
+// smaller fails with ERROR_INSUFFICIENT_BUFFER, and nothing is written past the buffer.
+template <typename Out, typename Convert>
+void CheckBufferSizes(const Out& expected, Convert convert) {
+  const int needed = static_cast<int>(expected.size());
   for (int size = 1; size <= needed + 2; ++size) {
-    std::u16string out(size + 8, u'#');
+    SCOPED_TRACE(size);
+    Out out(size + 8, '#');
     SetLastError(0);
-    const int got = MultiByteToWideChar(CP_UTF8, 0, bytes.data(), n, out.data(), size);
+    const int got = convert(out.data(), size);
     if (size < needed) {
-      EXPECT_EQ(got, 0) << size;
-      EXPECT_EQ(GetLastError(), ERROR_INSUFFICIENT_BUFFER) << size;
+      EXPECT_EQ(got, 0);
+      EXPECT_EQ(GetLastError(), ERROR_INSUFFICIENT_BUFFER);
     } else {
-      ASSERT_EQ(got, needed) << size;
-      EXPECT_EQ(out.substr(0, needed), units);
+      ASSERT_EQ(got, needed);
+      EXPECT_EQ(out.substr(0, needed), expected);
     }
-    EXPECT_EQ(out.substr(size), std::u16string(8, u'#')) << size;
-  }
-  const std::string back = FastToUtf8(units);
-  const int backNeeded = static_cast<int>(back.size());
-  for (int size = 1; size <= backNeeded + 2; ++size) {
-    std::string out(size + 8, '#');
-    SetLastError(0);
-    const int got =
-        WideCharToMultiByte(CP_UTF8, 0, units.data(), needed, out.data(), size, nullptr, nullptr);
-    if (size < backNeeded) {
-      EXPECT_EQ(got, 0) << size;
-      EXPECT_EQ(GetLastError(), ERROR_INSUFFICIENT_BUFFER) << size;
-    } else {
-      ASSERT_EQ(got, backNeeded) << size;
-      EXPECT_EQ(out.substr(0, backNeeded), back);
-    }
-    EXPECT_EQ(out.substr(size), std::string(8, '#')) << size;
+    EXPECT_EQ(out.substr(size), Out(8, '#'));
   }
 }
 
-TEST(CodePageUtf8, TerminatedInputCountsTheTerminator) {
-  MCHAR wide[8];
-  EXPECT_EQ(MultiByteToWideChar(CP_UTF8, 0, "h\xC3\xA9", -1, nullptr, 0), 3);
-  EXPECT_EQ(MultiByteToWideChar(CP_UTF8, 0, "h\xC3\xA9", -1, wide, 8), 3);
-  EXPECT_EQ(std::u16string(wide, 3), std::u16string(u"h\u00E9\0", 3));
-  char narrow[8];
-  EXPECT_EQ(WideCharToMultiByte(CP_UTF8, 0, u"h\u00E9", -1, nullptr, 0, nullptr, nullptr), 4);
-  EXPECT_EQ(WideCharToMultiByte(CP_UTF8, 0, u"h\u00E9", -1, narrow, 8, nullptr, nullptr), 4);
-  EXPECT_EQ(std::string(narrow, 4), std::string("h\xC3\xA9\0", 4));
+TEST(CodePageUtf8, BufferSizesAroundTheNeededSize) {
+  const std::string bytes = "ab\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80" + std::string(40, 'q') + "\xE6\x97\xA5\xC3";
+  const std::u16string units = FastToUtf16(bytes);
+  CheckBufferSizes(units, [&](MCHAR* out, int size) {
+    return MultiByteToWideChar(CP_UTF8, 0, bytes.data(), bytes.size(), out, size);
+  });
+  CheckBufferSizes(FastToUtf8(units), [&](char* out, int size) {
+    return WideCharToMultiByte(CP_UTF8, 0, units.data(), units.size(), out, size, nullptr, nullptr);
+  });
 }
 
 TEST(CodePageUtf8, LongTextsCrossEveryBlockBoundary) {
   // ASCII of every length up to 300 followed by one non-ASCII character and more ASCII.
   for (int len = 0; len < 300; ++len) {
     const std::string s = std::string(len, 'k') + "\xE2\x82\xAC" + std::string(len % 37, 'z');
-    const std::u16string expected =
-        std::u16string(len, u'k') + u"\u20AC" + std::u16string(len % 37, u'z');
+    const std::u16string expected = std::u16string(len, u'k') + u"\u20AC" + std::u16string(len % 37, u'z');
     ASSERT_EQ(FastToUtf16(s), expected) << len;
     ASSERT_EQ(FastToUtf8(expected), s) << len;
   }

@@ -52,14 +52,19 @@ const double kIndefinite = FromBits(0xFFF8000000000000ULL);  // what 0.0/0.0 giv
 const double kSignallingNan = FromBits(0x7FF0000000000001ULL);
 const double kNegativeNanWithPayload = FromBits(0xFFF8000000000001ULL);
 
+struct Row {
+  const char* name;
+  std::string actual;
+  const char* expected;
+};
+
+void Check(const std::vector<Row>& rows) {
+  for (const Row& row : rows) EXPECT_EQ(row.actual, row.expected) << row.name;
+}
+
 TEST(CrtFormatFloat, InfinitiesAndNaNs) {
-  struct Row {
-    const char* name;
-    std::string actual;
-    const char* expected;
-  };
   volatile double zero = 0.0;
-  const Row rows[] = {
+  const std::vector<Row> rows = {
       {"infinity [syntax]", Format("%f %e %g %a", kInf, kInf, kInf, kInf), "inf inf inf inf"},
       {"capital types give capitals [syntax]", Format("%F %E %G %A", kInf, -kInf, kInf, kInf), "INF -INF INF INF"},
       {"quiet NaN [syntax]", Format("%f %G", kQuietNan, kQuietNan), "nan NAN"},
@@ -74,19 +79,11 @@ TEST(CrtFormatFloat, InfinitiesAndNaNs) {
       {"width and '-'", Format("%-10f|%10F|", kIndefinite, kInf), "-nan(ind) |       INF|"},
       {"precision and '#' do not change them", Format("%.2f %#.0e %.1g", kInf, kQuietNan, -kInf), "inf nan -inf"},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.name);
-    EXPECT_EQ(row.actual, row.expected);
-  }
+  Check(rows);
 }
 
 TEST(CrtFormatFloat, FiniteForms) {
-  struct Row {
-    const char* name;
-    std::string actual;
-    const char* expected;
-  };
-  const Row rows[] = {
+  const std::vector<Row> rows = {
       {"f default precision 6 [syntax]", Format("%f", 1.5), "1.500000"},
       {"e has a two-digit exponent [syntax]", Format("%e %E", 1.5, 12345.678), "1.500000e+00 1.234568E+04"},
       {"three exponent digits only when needed [syntax]", Format("%e %e", 1e100, 1e-300),
@@ -98,7 +95,6 @@ TEST(CrtFormatFloat, FiniteForms) {
       {"# keeps the point and zeros [syntax: flags]", Format("%#g|%#.0f|%#.0e|%#.3g", 1.0, 1.0, 1.0, 100.0),
        "1.00000|1.|1.e+00|100."},
       {"precision 0 prints no point [syntax: precision]", Format("%.0f %.0e", 3.7, 12345.0), "4 1e+04"},
-      {"%.*f example [syntax]", Format("%.*f", 3, 3.14159265), "3.142"},
       {"exact halves round to even", Format("%.0f %.0f %.0f %.2f", 0.5, 1.5, 2.5, 0.125), "0 2 2 0.12"},
       {"negative zero keeps its sign", Format("%f %e %g", -0.0, -0.0, -0.0), "-0.000000 -0.000000e+00 -0"},
       {"flags", Format("%+.1f|% .1f|%08.3f|%-8.2f|", 2.0, 2.0, -3.14159, 1.5), "+2.0| 2.0|-003.142|1.50    |"},
@@ -113,17 +109,12 @@ TEST(CrtFormatFloat, FiniteForms) {
       {"large precision: exact digits then zeros", Format("%.30f", 0.1), "0.100000000000000005551115123126"},
       {"largest double", Format("%.0f", std::numeric_limits<double>::max()).substr(0, 20), "17976931348623157081"},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.name);
-    EXPECT_EQ(row.actual, row.expected);
-  }
+  Check(rows);
 }
 
 TEST(CrtFormatFloat, PrecisionsBeyondTheDigitsOfADoubleAddZeros) {
-  const std::string fixed = Format("%.1500f", 0.1);
-  EXPECT_EQ(fixed, Glibc("%.1500f", 0.1));
-  const std::string scientific = Format("%.1200e", 1.0 / 3.0);
-  EXPECT_EQ(scientific, Glibc("%.1200e", 1.0 / 3.0));
+  EXPECT_EQ(Format("%.1500f", 0.1), Glibc("%.1500f", 0.1));
+  EXPECT_EQ(Format("%.1200e", 1.0 / 3.0), Glibc("%.1200e", 1.0 / 3.0));
   EXPECT_EQ(Format("%#.1300g", 2.0), Glibc("%#.1300g", 2.0));
   EXPECT_EQ(Format("%.20a", 1.0), "0x1.00000000000000000000p+0");
   EXPECT_EQ(Format("%.100000f", 1.0), "1." + std::string(100000, '0'));
@@ -157,21 +148,6 @@ TEST(CrtFormatFloat, FiniteValuesMatchGlibcDigitForDigit) {
     }
     ASSERT_EQ(Format("%a", v), Glibc("%.13a", v)) << std::hexfloat << v;
   }
-}
-
-std::u16string WideFormat(const MCHAR* format, ...) {
-  va_list args;
-  va_start(args, format);
-  MCHAR buffer[64];
-  const int n = _vsnwprintf_s(buffer, 64, _TRUNCATE, format, args);
-  va_end(args);
-  return n >= 0 ? std::u16string(buffer) : std::u16string(u"<failed>");
-}
-
-TEST(CrtFormatFloat, WideFormatsPrintTheSameText) {
-  EXPECT_EQ(WideFormat(u"%08.3f", -3.14159), u"-003.142");
-  EXPECT_EQ(WideFormat(u"%E", kIndefinite), u"-NAN(IND)");
-  EXPECT_EQ(WideFormat(u"%a", 1.0), u"0x1.0000000000000p+0");
 }
 
 }  // namespace

@@ -57,44 +57,27 @@ TEST(CrtLocale, NamesResolveToTheirCodePages) {
     int category;
     UINT codePage;  // 0: no locale
   };
+  constexpr int kAll = LC_ALL_CRT;
   const Row rows[] = {
-      {"C", LC_ALL_CRT, 28591},
-      {"Japanese", LC_ALL_CRT, 932},
-      {"japanese", LC_ALL_CRT, 932},
-      {"jpn", LC_ALL_CRT, 932},
-      {"chinese-simplified", LC_ALL_CRT, 936},
-      {"chinese-traditional", LC_ALL_CRT, 950},
-      {"chinese", LC_ALL_CRT, 936},
-      {"korean", LC_ALL_CRT, 949},
-      {"Korean_Korea.949", LC_ALL_CRT, 949},
-      {"English_United States.1252", LC_ALL_CRT, 1252},
-      {"English_United Kingdom", LC_ALL_CRT, 1252},
-      {"Japanese_Japan.932", LC_ALL_CRT, 932},
-      {"Chinese (Simplified)_China.936", LC_ALL_CRT, 936},
-      {"Chinese_Taiwan.950", LC_ALL_CRT, 950},
-      {"German_Germany", LC_ALL_CRT, 1252},
-      {"Russian", LC_ALL_CRT, 1251},
-      {"Greek", LC_ALL_CRT, 1253},
-      {"Thai", LC_ALL_CRT, 874},
-      {"ja-JP", LC_ALL_CRT, 932},
-      {"ko", LC_ALL_CRT, 949},
-      {"English.ACP", LC_ALL_CRT, 1252},
-      {"English.OCP", LC_ALL_CRT, 437},
-      {"Japanese.utf8", LC_ALL_CRT, 65001},
-      {".932", LC_ALL_CRT, 932},
-      {".UTF-8", LC_ALL_CRT, 65001},
-      {"", LC_ALL_CRT, 1252},  // the user's locale with the process's code page (pinned to 1252)
+      {"C", kAll, 28591},          {"Japanese", kAll, 932},     {"japanese", kAll, 932},
+      {"jpn", kAll, 932},          {"chinese-simplified", kAll, 936},
+      {"chinese-traditional", kAll, 950},                       {"chinese", kAll, 936},
+      {"korean", kAll, 949},       {"Korean_Korea.949", kAll, 949},
+      {"English_United States.1252", kAll, 1252},               {"English_United Kingdom", kAll, 1252},
+      {"Japanese_Japan.932", kAll, 932},                        {"Chinese (Simplified)_China.936", kAll, 936},
+      {"Chinese_Taiwan.950", kAll, 950},                        {"German_Germany", kAll, 1252},
+      {"Russian", kAll, 1251},     {"Greek", kAll, 1253},       {"Thai", kAll, 874},
+      {"ja-JP", kAll, 932},        {"ko", kAll, 949},           {"English.ACP", kAll, 1252},
+      {"English.OCP", kAll, 437},  {"Japanese.utf8", kAll, 65001},
+      {".932", kAll, 932},         {".UTF-8", kAll, 65001},     {"Hindi.utf8", kAll, 65001},
+      {"", kAll, 1252},  // the user's locale with the process's code page (pinned to 1252)
       {"Japanese", LC_CTYPE_CRT, 932},
       {"Japanese", LC_NUMERIC_CRT, 28591},  // the character type stays "C"
-      {"Hindi.utf8", LC_ALL_CRT, 65001},
       // Refused:
-      {"Hindi", LC_ALL_CRT, 0},  // a Unicode-only language has no ANSI code page
-      {"Klingon", LC_ALL_CRT, 0},
-      {"English_Narnia", LC_ALL_CRT, 0},
-      {"Japanese.12345", LC_ALL_CRT, 0},
-      {".50220", LC_ALL_CRT, 0},  // ISO-2022 keeps shift states: not a multi-byte code page
-      {".65000", LC_ALL_CRT, 0},
-      {"Japanese.", LC_ALL_CRT, 0},
+      {"Hindi", kAll, 0},  // a Unicode-only language has no ANSI code page
+      {"Klingon", kAll, 0},        {"English_Narnia", kAll, 0}, {"Japanese.12345", kAll, 0},
+      {".50220", kAll, 0},  // ISO-2022 keeps shift states: not a multi-byte code page
+      {".65000", kAll, 0},         {"Japanese.", kAll, 0},
       {"Japanese", 6, 0},  // glibc's LC_ALL is not a runtime category
       {"Japanese", -1, 0},
   };
