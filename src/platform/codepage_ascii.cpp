@@ -42,17 +42,6 @@ std::size_t AsciiLengthSse2(const unsigned char* s, std::size_t n) noexcept {
   return i;
 }
 
-// Bit 2k and 2k+1 set for every unit k of the two vectors (16 units) that is below 0x80.
-inline unsigned AsciiUnitMaskSse2(__m128i v0, __m128i v1) {
-  const __m128i high = _mm_set1_epi16(static_cast<short>(0xFF80));
-  const __m128i zero = _mm_setzero_si128();
-  const unsigned m0 =
-      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
-  const unsigned m1 =
-      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
-  return m0 | (m1 << 16);
-}
-
 std::size_t NarrowSse2(const char16_t* s, std::size_t n, char* out) noexcept {
   std::size_t i = 0;
   for (; i + 16 <= n; i += 16) {

@@ -3,9 +3,22 @@
 // UTF-16 units and back. AVX2 is used when the processor has it (chosen once at start-up; the
 // environment variable VYN_FORCE_SSE2 set to 1 keeps the SSE2 versions, for testing).
 
+#include <emmintrin.h>
+
 #include <cstddef>
 
 namespace win32::detail {
+
+// Bit 2k and 2k+1 set for every unit k of the two vectors (16 units) that is below 0x80.
+inline unsigned AsciiUnitMaskSse2(__m128i v0, __m128i v1) {
+  const __m128i high = _mm_set1_epi16(static_cast<short>(0xFF80));
+  const __m128i zero = _mm_setzero_si128();
+  const unsigned m0 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
+  const unsigned m1 =
+      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
+  return m0 | (m1 << 16);
+}
 
 // Widens the ASCII prefix of s[0, n) into out and returns its length. Works in whole blocks:
 // out must have room for n units, and units after the prefix may be overwritten.

@@ -83,17 +83,6 @@ TranscodeResult DecodeLoop(const std::uint8_t* s, std::size_t n, Sink& sink, boo
 
 // ---- UTF-8 encoding ----
 
-// Bit 2k and 2k+1 set for every unit k of the two vectors (16 units) that is below 0x80.
-inline unsigned AsciiUnitMask(__m128i v0, __m128i v1) {
-  const __m128i high = _mm_set1_epi16(static_cast<short>(0xFF80));
-  const __m128i zero = _mm_setzero_si128();
-  const unsigned m0 =
-      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v0, high), zero)));
-  const unsigned m1 =
-      static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(_mm_and_si128(v1, high), zero)));
-  return m0 | (m1 << 16);
-}
-
 template <bool kStrict>
 TranscodeResult EncodeLoop(const char16_t* s, std::size_t n, char* out, bool final) {
   utf8::ByteWriter w(out);
@@ -103,7 +92,7 @@ TranscodeResult EncodeLoop(const char16_t* s, std::size_t n, char* out, bool fin
     if (end - p >= 16) {
       const __m128i v0 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p));
       const __m128i v1 = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p + 8));
-      const unsigned mask = AsciiUnitMask(v0, v1);
+      const unsigned mask = AsciiUnitMaskSse2(v0, v1);
       // The 16 narrowed units go out whole; only the ASCII prefix is kept.
       _mm_storeu_si128(reinterpret_cast<__m128i*>(w.out), _mm_packus_epi16(v0, v1));
       if (mask == 0xFFFFFFFFu) {

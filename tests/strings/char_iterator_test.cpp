@@ -7,20 +7,13 @@
 #include <vector>
 
 #include "vynutil/char.h"
+#include "support/process_code_pages.h"
 #include "win32/codepage.h"
 
 using VynSDK::Util::Char;
 using VynSDK::Util::CharIterator;
 
 namespace {
-
-class ProcessCodePages {
- public:
-  ProcessCodePages(UINT acp, UINT oemcp) { win32::SetProcessCodePages(acp, oemcp); }
-  ~ProcessCodePages() { win32::SetProcessCodePages(0, 0); }
-  ProcessCodePages(const ProcessCodePages&) = delete;
-  ProcessCodePages& operator=(const ProcessCodePages&) = delete;
-};
 
 struct Step {
   std::size_t offset;  // units from the start

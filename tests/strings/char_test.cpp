@@ -8,6 +8,7 @@
 #include <cstring>
 #include <string>
 
+#include "support/process_code_pages.h"
 #include "win32/codepage.h"
 #include "win32/last_error.h"
 
@@ -15,16 +16,6 @@ using VynSDK::Util::Char;
 using VynSDK::Util::VynString;
 
 namespace {
-
-// Pins the process code pages for one test and returns them to their defaults afterwards, also
-// when the test fails part-way.
-class ProcessCodePages {
- public:
-  ProcessCodePages(UINT acp, UINT oemcp) { win32::SetProcessCodePages(acp, oemcp); }
-  ~ProcessCodePages() { win32::SetProcessCodePages(0, 0); }
-  ProcessCodePages(const ProcessCodePages&) = delete;
-  ProcessCodePages& operator=(const ProcessCodePages&) = delete;
-};
 
 }  // namespace
 
