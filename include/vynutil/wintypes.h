@@ -65,3 +65,25 @@ using HGLOBAL = HANDLE;
 using HLOCAL = HANDLE;
 
 #define INVALID_HANDLE_VALUE (reinterpret_cast<HANDLE>(static_cast<LONG_PTR>(-1)))
+
+// Geometry records of the window and drawing interfaces.
+struct RECT {
+  LONG left;
+  LONG top;
+  LONG right;
+  LONG bottom;
+};
+struct POINT {
+  LONG x;
+  LONG y;
+};
+struct SIZE {
+  LONG cx;
+  LONG cy;
+};
+
+// A colour as 0x00BBGGRR.
+using COLORREF = DWORD;
+
+// An exported function found by name in a module; cast to its real type before calling.
+using FARPROC = INT_PTR (*)();
