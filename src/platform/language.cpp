@@ -1,4 +1,5 @@
-// The user-interface language: an environment override, else the process locale's language.
+// The user-interface language: an environment override, else the process locale's language; a
+// thread may choose its own.
 
 #include "win32/language.h"
 
@@ -77,10 +78,23 @@ LANGID LanguageOfLocaleName(const char* name) noexcept {
 
 namespace win32 {
 
+namespace {
+thread_local LANGID t_threadUILanguage = 0;  // 0: follow the user's default
+}
+
 LANGID GetUserDefaultUILanguage() {
   if (LANGID forced = detail::LanguageFromVariable()) return forced;
   LANGID language = detail::LanguageOfLocaleName(detail::MessagesLocaleName());
   return language != 0 ? language : detail::kEnglishUnitedStates;
+}
+
+LANGID GetThreadUILanguage() {
+  return t_threadUILanguage != 0 ? t_threadUILanguage : GetUserDefaultUILanguage();
+}
+
+LANGID SetThreadUILanguage(LANGID language) {
+  t_threadUILanguage = language;
+  return GetThreadUILanguage();
 }
 
 }  // namespace win32

@@ -13,6 +13,14 @@ namespace win32 {
 // languages. Read anew at each call.
 VYN_API LANGID GetUserDefaultUILanguage();
 
+// The calling thread's user-interface language, which picks the language of resources
+// (LoadStringW, FindResourceW): the one SetThreadUILanguage gave this thread, else
+// GetUserDefaultUILanguage().
+VYN_API LANGID GetThreadUILanguage();
+// Sets the calling thread's user-interface language; 0 returns the thread to the default.
+// Returns the language now in effect for the thread.
+VYN_API LANGID SetThreadUILanguage(LANGID language);
+
 }  // namespace win32
 
 namespace win32::detail {
