@@ -18,6 +18,16 @@ void TabAppend(benchmark::State& state) {
   }
 }
 
+// Every append through the exported block function, without the template's in-place path.
+void TabInsertAtEveryElement(benchmark::State& state) {
+  for (auto _ : state) {
+    TabHdr* th = nullptr;
+    for (int i = 0; i < kCount; ++i) TBInsertAt(&th, i, 1, &i, sizeof(int), 0);
+    benchmark::DoNotOptimize(th);
+    zfree(reinterpret_cast<void**>(&th));
+  }
+}
+
 void VectorPushBack(benchmark::State& state) {
   for (auto _ : state) {
     std::vector<int> vector;
@@ -29,6 +39,7 @@ void VectorPushBack(benchmark::State& state) {
 }  // namespace
 
 BENCHMARK(TabAppend)->Unit(benchmark::kMillisecond);
+BENCHMARK(TabInsertAtEveryElement)->Unit(benchmark::kMillisecond);
 BENCHMARK(VectorPushBack)->Unit(benchmark::kMillisecond);
 
 BENCHMARK_MAIN();
