@@ -92,6 +92,11 @@ HMODULE LoadLibraryW(const MCHAR* fileName) {
   return detail::HasFolderPart(name) ? LoadByPath(name) : LoadBySearch(name);
 }
 
+HMODULE LoadLibraryExW(const MCHAR* fileName, HANDLE hFile, DWORD dwFlags) {
+  if (hFile != nullptr || dwFlags != 0) return Fail<HMODULE>(ERROR_INVALID_PARAMETER, nullptr);
+  return LoadLibraryW(fileName);
+}
+
 BOOL FreeLibrary(HMODULE module) {
   detail::LoadedModule loaded;
   if (!detail::FindLoadedModule(module, loaded)) return Fail<BOOL>(ERROR_MOD_NOT_FOUND, FALSE);

@@ -7,6 +7,7 @@
 #include <optional>
 #include <string_view>
 
+#include "network_drive_config.h"
 #include "utf_strings.h"
 #include "win32/environment.h"
 
@@ -95,6 +96,15 @@ std::string MapPath(const MCHAR* path) {
     if (StartsWithNoCase(view, "UNC/")) return Join(UncRoot(), view.substr(4));
   }
   if (view.size() >= 2 && IsAsciiLetter(view[0]) && view[1] == ':') {
+    // A network drive is its share: "N:\x" is "\\server\share\x".
+    if (std::optional<std::u16string> share = detail::MappedNetworkDrive(view[0])) {
+      const std::string rest(view.substr(2));
+      std::string shareFolder = detail::Utf8Of(std::u16string_view(*share).substr(2));
+      for (char& c : shareFolder) {
+        if (c == '\\') c = '/';
+      }
+      return Join(Join(UncRoot(), shareFolder), rest);
+    }
     return Join(DriveRoot(view[0]), view.substr(2));
   }
   if (view.size() > 2 && view.starts_with("//") && view[2] != '/') {

@@ -19,6 +19,10 @@ namespace win32 {
 // the current folder, then the folders of PATH; names are matched case-insensitively inside each
 // folder. A name without extension gets ".dll"; a name ending in '.' has no extension.
 VYN_API HMODULE LoadLibraryW(const MCHAR* fileName);
+// LoadLibraryW with a reserved file handle and flags: with a null hFile and dwFlags 0 it is
+// LoadLibraryW; anything else gives null with ERROR_INVALID_PARAMETER (no other loading mode is
+// offered).
+VYN_API HMODULE LoadLibraryExW(const MCHAR* fileName, HANDLE hFile, DWORD dwFlags);
 // Gives up one load; the module is unloaded with its last one. FALSE with ERROR_MOD_NOT_FOUND
 // for a null or unknown handle, with ERROR_INVALID_HANDLE when the module has no load left to
 // give up.

@@ -14,7 +14,8 @@ namespace win32 {
 //   - a "\\?\" prefix is dropped ("\\?\UNC\server\share" is the UNC path "\\server\share");
 //   - "X:\rest" and "X:rest" become the root of drive X followed by "/rest"; the root is "/" unless
 //     SetDriveRoot or the environment variable TAVLO_PLATFORM_DRIVE_X (X upper case) names
-//     another folder;
+//     another folder; a drive configured as a network drive (network_drives.h) is its share
+//     instead: "N:\rest" maps as "\\server\share\rest" does;
 //   - "\\server\share\rest" becomes the UNC root followed by "/server/share/rest"; the root is
 //     "/mnt/unc" unless SetUncRoot or TAVLO_PLATFORM_UNC_ROOT names another folder;
 //   - everything else keeps its place, so relative paths stay relative and POSIX paths pass
