@@ -8,6 +8,7 @@
 
 #include "vynutil/export.h"
 #include "vynutil/host_interfaces.h"
+#include "vynutil/path.h"
 #include "vynutil/wintypes.h"
 
 // The core interface. The getters return the stored pointer unchanged, typed as the face asked for.
@@ -55,3 +56,7 @@ VYN_API void UtilSetPluginIniFilename(const MCHAR* name);
 VYN_API const MCHAR* UtilGetPluginIniFilename();
 // Always "plugin.ini".
 VYN_API const MCHAR* UtilGetSystemPluginIniFilename();
+// The full path of the plug-in INI file: empty until set. The reference stays valid for the life
+// of the process; its value changes with the next set call.
+VYN_API void UtilSetFullPluginIniFilePath(const VynSDK::Util::Path& path);
+VYN_API const VynSDK::Util::Path& UtilGetFullPluginIniFilePath();

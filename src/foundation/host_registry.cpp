@@ -19,6 +19,11 @@ WStr& PluginIniFilename() {
   return name;
 }
 
+VynSDK::Util::Path& FullPluginIniFilePath() {
+  static VynSDK::Util::Path path;
+  return path;
+}
+
 }  // namespace
 
 void UtilSetCOREInterface(Interface18* core) { core_interface = core; }
@@ -60,3 +65,6 @@ HWND Util::GetMainVynWindow() { return main_window; }
 void UtilSetPluginIniFilename(const MCHAR* name) { PluginIniFilename() = name; }
 const MCHAR* UtilGetPluginIniFilename() { return PluginIniFilename().data(); }
 const MCHAR* UtilGetSystemPluginIniFilename() { return u"plugin.ini"; }
+
+void UtilSetFullPluginIniFilePath(const VynSDK::Util::Path& path) { FullPluginIniFilePath() = path; }
+const VynSDK::Util::Path& UtilGetFullPluginIniFilePath() { return FullPluginIniFilePath(); }

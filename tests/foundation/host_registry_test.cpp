@@ -65,6 +65,10 @@ TEST(HostRegistry, PluginIniNames) {
   EXPECT_EQ(Text(UtilGetPluginIniFilename()), u"Mine.ini");
   EXPECT_EQ(Text(UtilGetSystemPluginIniFilename()), u"plugin.ini");
   UtilSetPluginIniFilename(u"Plugin.UserSettings.ini");
+  EXPECT_TRUE(UtilGetFullPluginIniFilePath().IsEmpty());
+  UtilSetFullPluginIniFilePath(VynSDK::Util::Path(u"C:/settings/Plugin.UserSettings.ini"));
+  EXPECT_EQ(Text(UtilGetFullPluginIniFilePath().GetCStr()), u"C:\\settings\\Plugin.UserSettings.ini");
+  UtilSetFullPluginIniFilePath(VynSDK::Util::Path());
 }
 
 TEST(EntryPoints, RichEditModulesAreLoadedOnceAndFreedWhenLoaded) {
