@@ -21,16 +21,16 @@ const MCHAR* RemoteNameOfDrive(MCHAR letter, std::vector<std::uint64_t>& buffer)
                            &enumeration) != win32::NO_ERROR) {
     return nullptr;
   }
+  // Entries come in batches of what fits; a batch that cannot hold even one entry asks for a
+  // larger buffer. The listing is read until the drive is found or the list ends.
   DWORD bytes = kFirstBufferBytes;
-  DWORD count = 0;
-  DWORD result;
-  do {
-    buffer.assign((bytes + sizeof(std::uint64_t) - 1) / sizeof(std::uint64_t), 0);
-    count = 0xFFFFFFFF;
-    result = win32::WNetEnumResourceW(enumeration, &count, buffer.data(), &bytes);
-  } while (result == win32::ERROR_MORE_DATA);
   const MCHAR* remote = nullptr;
-  if (result == win32::NO_ERROR) {
+  while (!remote) {
+    buffer.assign((bytes + sizeof(std::uint64_t) - 1) / sizeof(std::uint64_t), 0);
+    DWORD count = 0xFFFFFFFF;
+    const DWORD result = win32::WNetEnumResourceW(enumeration, &count, buffer.data(), &bytes);
+    if (result == win32::ERROR_MORE_DATA) continue;
+    if (result != win32::NO_ERROR) break;
     const auto* resources = reinterpret_cast<const win32::NETRESOURCEW*>(buffer.data());
     for (DWORD i = 0; i < count && !remote; ++i) {
       const MCHAR* local = resources[i].lpLocalName;

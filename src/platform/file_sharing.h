@@ -10,8 +10,9 @@
 // bytes it conflicts with, and gives its bytes back when it finds one. Two conflicting opens at
 // the same moment may therefore both fail, but two conflicting opens never both succeed. The
 // locks go with the descriptor, so a process that dies leaves nothing behind. A descriptor opened
-// without read access cannot take locks: its rights are then checked against other processes but
-// not shown to them.
+// without read access (a file its caller may write but not read) cannot take locks: its rights
+// are then checked against other processes but not shown to them; one that only refers to the
+// path (no read permission at all, no data rights asked) is checked inside the process only.
 
 #include <sys/types.h>
 

@@ -105,7 +105,7 @@ BOOL PathRelativePathToW(LPWSTR pszPath, LPCWSTR pszFrom, DWORD dwAttrFrom, LPCW
 
   std::u16string result;
   std::u16string_view rest = std::u16string_view(from).substr(std::min(common, from.size()));
-  if (rest.empty()) result = u".";
+  if (rest.empty()) result.assign(1, u'.');
   if (!rest.empty() && rest.front() == u'\\') rest.remove_prefix(1);
   while (!rest.empty()) {
     const std::size_t separator = rest.find(u'\\');

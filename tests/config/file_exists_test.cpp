@@ -124,6 +124,9 @@ TEST(FileExists, UniversalNamesOfMappedDrives) {
   WStr out(u"stale");
   EXPECT_EQ(UtilGetUniversalFilename(out, u"q:\\models\\a.max"), 1);
   EXPECT_EQ(std::u16string(out.data()), shares[u'Q' - u'M'] + u"\\models\\a.max");
+  // The last drive comes in a later batch of the listing.
+  EXPECT_EQ(UtilGetUniversalFilename(out, u"Z:\\x"), 1);
+  EXPECT_EQ(std::u16string(out.data()), shares.back() + u"\\x");
   for (const MCHAR* path : {u"C:\\models", u"\\\\srv\\share\\a", u"Q:", u"relative", u"7:\\x"}) {
     out = u"stale";
     EXPECT_EQ(UtilGetUniversalFilename(out, path), 0);

@@ -3,6 +3,7 @@
 
 #include "vynutil/export.h"
 #include "vynutil/wintypes.h"
+#include "win32/file_types.h"
 
 namespace win32 {
 
