@@ -338,9 +338,10 @@ Path& Path::Normalize() {
   if (!t.empty()) {
     ForwardSlashesToBackslashes(t);
     CollapseBackslashes(t);
+    // The drive's backslash goes in first, so that "C:.\a" and "C:..\a" fold like "C:\.\a".
+    if (HasDrivePrefix(t) && (t.size() == 2 || t[2] != kBackslash)) t.insert(2, 1, kBackslash);
     RemoveDotComponents(t);
     FoldDotDotComponents(t);
-    if (HasDrivePrefix(t) && (t.size() == 2 || t[2] != kBackslash)) t.insert(2, 1, kBackslash);
     impl.cacheStale = true;
   }
   if (IsAbsolute() || (t.size() >= 2 && t[0] == u'.' && t[1] == u'.')) return *this;

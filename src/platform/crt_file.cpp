@@ -8,13 +8,61 @@
 #include "syscalls.h"
 
 namespace win32 {
+namespace {
+
+// The runtime reports a write stopped by a quota or the file-size limit as a full disk.
+void DiskFullAsENOSPC() {
+  if (errno == EFBIG || errno == EDQUOT) errno = ENOSPC;
+}
+
+}  // namespace
+
+std::size_t fread(void* buffer, std::size_t size, std::size_t count, FILE* stream) {
+  if (stream == nullptr) {
+    errno = EINVAL;
+    return 0;
+  }
+  return sys::Syscalls().fread(buffer, size, count, stream);
+}
+
+std::size_t fwrite(const void* data, std::size_t size, std::size_t count, FILE* stream) {
+  if (stream == nullptr) {
+    errno = EINVAL;
+    return 0;
+  }
+  detail::FileSizeSignalGuard guard;
+  const std::size_t written = sys::Syscalls().fwrite(data, size, count, stream);
+  if (written < count) DiskFullAsENOSPC();
+  return written;
+}
+
+int fflush(FILE* stream) {
+  detail::FileSizeSignalGuard guard;
+  const int result = sys::Syscalls().fflush(stream);
+  if (result != 0) DiskFullAsENOSPC();
+  return result;
+}
+
+int fclose(FILE* stream) {
+  if (stream == nullptr) {
+    errno = EINVAL;
+    return EOF;
+  }
+  detail::FileSizeSignalGuard guard;
+  const int result = sys::Syscalls().fclose(stream);
+  if (result != 0) DiskFullAsENOSPC();
+  return result;
+}
 
 int _fseeki64(FILE* stream, LONGLONG offset, int origin) {
   if (stream == nullptr || (origin != SEEK_SET && origin != SEEK_CUR && origin != SEEK_END)) {
     errno = EINVAL;
     return -1;
   }
-  return sys::Syscalls().fseeko(stream, offset, origin) == 0 ? 0 : -1;
+  detail::FileSizeSignalGuard guard;  // a seek writes what is buffered
+  if (sys::Syscalls().fseeko(stream, offset, origin) == 0) return 0;
+  DiskFullAsENOSPC();
+  return -1;
 }
 
 LONGLONG _ftelli64(FILE* stream) {

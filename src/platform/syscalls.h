@@ -37,6 +37,9 @@ struct SyscallTable {
   ssize_t (*lgetxattr)(const char* path, const char* name, void* value, size_t size);
   FILE* (*fopen)(const char* path, const char* mode);
   int (*fclose)(FILE* stream);
+  size_t (*fread)(void* buffer, size_t size, size_t count, FILE* stream);
+  size_t (*fwrite)(const void* data, size_t size, size_t count, FILE* stream);
+  int (*fflush)(FILE* stream);
   int (*fseeko)(FILE* stream, off_t offset, int whence);
   off_t (*ftello)(FILE* stream);
   // Folders and names.

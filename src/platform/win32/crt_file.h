@@ -1,5 +1,7 @@
 #pragma once
-// The C runtime's 64-bit stream positioning and file-size change, with its errno results.
+// The C runtime's stream transfers, 64-bit stream positioning and file-size change, with its
+// errno results. Calls that may write (fwrite, fflush, fclose, seeks, size changes) never end the
+// process on its file-size limit: they fail with ENOSPC instead, as a full disk does.
 
 #include <cstdio>
 
@@ -9,6 +11,12 @@
 namespace win32 {
 
 using errno_t = int;
+
+// fread, fwrite, fflush and fclose of the runtime, with EFBIG and EDQUOT reported as ENOSPC.
+VYN_API std::size_t fread(void* buffer, std::size_t size, std::size_t count, FILE* stream);
+VYN_API std::size_t fwrite(const void* data, std::size_t size, std::size_t count, FILE* stream);
+VYN_API int fflush(FILE* stream);
+VYN_API int fclose(FILE* stream);
 
 // Moves the stream's position (origin SEEK_SET, SEEK_CUR or SEEK_END) and clears its end-of-file
 // indicator. 0, or -1 with errno: EINVAL for a null stream, another origin or a position before
