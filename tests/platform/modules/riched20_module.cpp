@@ -7,7 +7,9 @@
 #define PROBE_EXPORT extern "C" __attribute__((visibility("default")))
 
 // How many times this image was initialised: 1 after each real load, whatever the load count.
-PROBE_EXPORT int VynProbeInitialisations = 0;
+extern "C" {
+__attribute__((visibility("default"))) int VynProbeInitialisations = 0;
+}
 
 PROBE_EXPORT int VynProbeAnswer() { return 42; }
 
