@@ -132,6 +132,53 @@ class VYN_API CStr : public VynHeapOperators {
   bool operator>(const CStr& other) const noexcept;
   bool operator>=(const CStr& other) const noexcept;
 
+  // Editing, searching and case, as WStr's, on bytes. In the double-byte code pages (932, 936,
+  // 949, 950) a lead byte and the byte after it are one character for every one of them: no
+  // operation splits such a character or matches, finds or maps half of one. Where a byte
+  // position falls inside a double-byte character, that character is left out of what the
+  // operation keeps or returns rather than split: Substr leaves out a character cut by either
+  // end, remove takes out a character its position or run cuts into, Replace finds no match
+  // that starts or ends inside one.
+
+  CStr Substr(int start, int count) const;
+  CStr& remove(int pos);
+  CStr& remove(int pos, int count);
+  // Matches only whole characters of the text.
+  std::size_t Replace(const char* find, const char* replaceBy, bool firstOnly = false, std::size_t start = 0);
+
+  // The byte index of the first (last) single-byte character c; -1 when there is none.
+  int first(char c) const;
+  int last(char c) const;
+  // Exact comparison compares bytes; otherwise each character is compared under its simple
+  // lower-case mapping in the narrow code page. A match must end (EndsWith: begin) on a
+  // character boundary of the text.
+  bool StartsWith(const CStr& s, bool caseSensitive = true) const;
+  bool EndsWith(const CStr& s, bool caseSensitive = true) const;
+  // True when the first (last) character is the single byte c.
+  bool StartsWith(char c, bool caseSensitive = true) const;
+  bool EndsWith(char c, bool caseSensitive = true) const;
+  bool CaseInsensitiveEqual(const CStr& other) const;
+  bool CaseInsensitiveEqual(const char* other) const;
+
+  // Case, in place, a character at a time; a character whose mapping the narrow code page cannot
+  // hold in the same number of bytes stays as it is.
+  void toLower();
+  void toUpper();
+
+  // The number of line feeds (0x0A) in the text.
+  std::size_t NumberOfLines() const;
+
+  // Language characters: a double-byte character of the narrow code page is one character; in a
+  // single-byte code page every byte is one.
+  int LanguageCharacterCount() const;
+  CStr MultiByteCharacterSubString(int firstChar, int count) const;
+  // The byte index of the first byte of character charIndex: -1 for the null string, 0 for a
+  // charIndex below 1, the length when the text has fewer characters.
+  int FindMultiByteCharacterFirstByteIndex(int charIndex) const;
+  // The byte index of the last byte of character charIndex: its first byte index, plus 1 for a
+  // double-byte character; -1 for the null string.
+  int FindMultiByteCharacterLastByteIndex(int charIndex) const;
+
   // Formatted printing with the Windows runtime's narrow format rules (%s and %c narrow,
   // %S and %C wide) into a narrow block; results as WStr::printf.
   int printf(const char* format, ...);

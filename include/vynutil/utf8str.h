@@ -112,6 +112,33 @@ class VYN_API UTF8Str : public VynHeapOperators {
   bool operator>(const UTF8Str& other) const noexcept;
   bool operator>=(const UTF8Str& other) const noexcept;
 
+  // True when the text begins (ends) with s: byte by byte when caseSensitive, otherwise after
+  // both texts are upper-cased (through UTF-16, as toUpper does). An empty text begins and ends
+  // only with an empty s; a non-empty text begins with an empty s but does not end with one.
+  bool StartsWith(const UTF8Str& s, bool caseSensitive = true) const;
+  bool EndsWith(const UTF8Str& s, bool caseSensitive = true) const;
+
+  // Case: the text converted to UTF-16, mapped as WStr::toLower / toUpper does and made back
+  // into UTF-8 in a new block (the byte length may change; malformed bytes become U+FFFD). An
+  // empty text is left alone.
+  void toLower();
+  void toUpper();
+
+  // The number of line feeds (0x0A) in the text.
+  std::size_t NumberOfLines() const;
+
+  // Language characters: a character is a first byte and the continuation bytes (10xxxxxx) that
+  // follow it, at most three. Counts and indices stop at the terminator.
+  int LanguageCharacterCount() const;
+  // As WStr::MultiByteCharacterSubString, in UTF-8 characters.
+  UTF8Str MultiByteCharacterSubString(int firstChar, int count) const;
+  // The byte index of the first byte of character charIndex: -1 for the null string, 0 for a
+  // charIndex below 1, the length when the text has fewer characters.
+  int FindMultiByteCharacterFirstByteIndex(int charIndex) const;
+  // The byte index of the last byte of character charIndex (its first byte index when the text
+  // has fewer characters); -1 for the null string.
+  int FindMultiByteCharacterLastByteIndex(int charIndex) const;
+
   // Formatted printing as CStr::printf: the format and narrow arguments are narrow code-page
   // text, formatted into a narrow block whose UTF-8 form this string then holds.
   int printf(const char* format, ...);
@@ -123,6 +150,11 @@ class VYN_API UTF8Str : public VynHeapOperators {
  private:
   friend class CStr;
   friend class WStr;
+
+  // The code point of the character at *byteIndex, which then moves past it; 0, with the index
+  // unchanged, at the terminator. The value is the bytes taken six bits at a time less the
+  // offset of a sequence of that length, whether or not the sequence is well formed.
+  unsigned int utf8_nextchar(int* byteIndex) const;
 
   char* buf;
 };

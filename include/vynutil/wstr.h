@@ -152,6 +152,63 @@ class VYN_API WStr : public VynHeapOperators {
   bool operator>(const WStr& other) const noexcept;
   bool operator>=(const WStr& other) const noexcept;
 
+  // Editing. Positions and counts are in units; every change goes to a block this holder alone
+  // owns, so text shared with others never changes.
+
+  // A new string of count units from start, count cut at the end of the text. The null string
+  // for a null string, a negative start or count, or a start beyond the end; an empty string for
+  // a start at the end.
+  WStr Substr(int start, int count) const;
+  // Cuts the text at pos, in place when this holder owns its block alone. No change when pos is
+  // negative or not below the length.
+  WStr& remove(int pos);
+  // Takes count units out at pos (fewer when the text ends first) into a new block of at least
+  // the old capacity. No change when pos or count is negative, pos lies beyond the end, or pos is
+  // the end and count reaches past it.
+  WStr& remove(int pos, int count);
+  // Replaces the occurrences of find from unit index start on by replaceBy, left to right (only
+  // the first when firstOnly); text put in is not searched again. Returns the number of
+  // replacements: 0, with no change, when the text is empty, find is null or empty, replaceBy is
+  // null or start is not below the length. replaceBy may point into this string's own text.
+  std::size_t Replace(const MCHAR* find, const MCHAR* replaceBy, bool firstOnly = false, std::size_t start = 0);
+
+  // Searching and comparing parts of the text.
+
+  // The index of the first (last) unit c; -1 when there is none, always for c 0.
+  int first(MCHAR c) const;
+  int last(MCHAR c) const;
+  // True when the text begins (ends) with s, unit by unit exactly or, when not caseSensitive,
+  // under the simple lower-case mapping of each unit. An empty text begins and ends only with an
+  // empty s; a non-empty text begins with an empty s but does not end with one.
+  bool StartsWith(const WStr& s, bool caseSensitive = true) const;
+  bool EndsWith(const WStr& s, bool caseSensitive = true) const;
+  // True when the first (last) unit is c, or lower-cases to the same unit when not
+  // caseSensitive. An empty text starts and ends only with the unit 0.
+  bool StartsWith(MCHAR c, bool caseSensitive = true) const;
+  bool EndsWith(MCHAR c, bool caseSensitive = true) const;
+  // Equal under the simple lower-case mapping of each unit; null and empty text are equal, and a
+  // null other counts as empty.
+  bool CaseInsensitiveEqual(const WStr& other) const;
+  bool CaseInsensitiveEqual(const MCHAR* other) const;
+
+  // Case, in place: each character (a surrogate pair as one) gets its simple lower- or
+  // upper-case mapping. An empty text is left alone.
+  void toLower();
+  void toUpper();
+
+  // The number of line feeds (U+000A) in the text: 0 for a text without one.
+  std::size_t NumberOfLines() const;
+
+  // Language characters: a lead surrogate and the unit after it are one character (a lead
+  // surrogate just before the terminator is one on its own).
+
+  // Characters in the text; 0 for the null string.
+  int LanguageCharacterCount() const;
+  // A new string of count characters from character firstChar on (fewer when the text ends
+  // first). The null string when firstChar is negative or not below the character count, or
+  // count is below 1.
+  WStr MultiByteCharacterSubString(int firstChar, int count) const;
+
   // Formatted printing with the Windows runtime's wide format rules (%s and %c take MCHAR text,
   // %S and %C narrow text). Returns the units written; on a null or invalid format returns a
   // negative value and leaves the text as it was. The _l forms format with the given locale.

@@ -16,6 +16,7 @@
 #include <utility>
 
 #include "strings/narrow_codepage.h"
+#include "strings/str_characters.h"
 #include "strings/vynstring_data.h"
 #include "vynutil/exception.h"
 #include "vynutil/vynstring.h"
@@ -26,6 +27,7 @@ namespace VynSDK::Util::StrClass {
 struct WideText {
   using Unit = MCHAR;
   static UINT Encoding() noexcept { return CP_UTF16; }
+  static Utf16Characters Characters() noexcept { return {}; }
   static constexpr const MCHAR* kNullIndexMessage =
       u"Attempting to dereference null WStr::buf variable in WStr::operator[]";
   // Resize works in place on any non-null text, the empty one included.
@@ -36,6 +38,8 @@ struct WideText {
 struct NarrowText {
   using Unit = char;
   static UINT Encoding() { return VynString::NormalizeCP(CStrCodePage()); }
+  // The lead bytes of the narrow code page as it is now.
+  static NarrowCharacters Characters() { return NarrowCharacters(Encoding()); }
   static constexpr const MCHAR* kNullIndexMessage =
       u"Attempting to dereference null CStr::buf variable in CStr::operator[]";
   // Resize replaces an empty text by a new block.
@@ -46,6 +50,7 @@ struct NarrowText {
 struct Utf8Text {
   using Unit = char;
   static UINT Encoding() noexcept { return CP_UTF8; }
+  static Utf8Characters Characters() noexcept { return {}; }
   static constexpr bool kResizeKeepsEmptyText = false;
 };
 
@@ -123,6 +128,9 @@ struct StrCore {
   }
 
   static bool IsEmpty(const Unit* buf) noexcept { return !buf || *buf == 0; }
+
+  // An index as the int the interface reports: -1 ("none") when it does not fit.
+  static int IntIndex(std::size_t i) noexcept { return i <= INT_MAX ? static_cast<int>(i) : -1; }
 
   // The room of the block's primary form, in the units of its own encoding.
   static std::size_t AllocatedChars(const Unit* buf) noexcept {
