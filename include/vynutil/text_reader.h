@@ -71,6 +71,8 @@ class VYN_API Reader : public BaseTextReader {
   // The encoding word: the detected or default encoding tag with the flags EncodingBigEndian,
   // EncodingDeclared, EncodingByteOrderMark (and EncodingPreferUTF8 when given and undecided).
   UINT Encoding() const { return m_encoding; }
+  // Whether detection decided the encoding (false: the caller's default stands).
+  bool Detected() const { return m_detected != 0; }
   LineEndMode Mode() const { return m_mode; }
   // Bytes sampled by detection on the next Open (at least 8 are).
   void SetDetectSize(std::size_t bytes) { m_detectSize = bytes; }

@@ -24,5 +24,6 @@ std::span<const Command> Commands();
 
 // The commands themselves.
 int RunConvert(Arguments args);
+int RunText(Arguments args);
 
 }  // namespace vyntool

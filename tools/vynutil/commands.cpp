@@ -7,6 +7,7 @@ namespace vyntool {
 std::span<const Command> Commands() {
   static constexpr Command kCommands[] = {
       {"convert", "convert text from one code page to another", RunConvert},
+      {"text", "detect the encoding of text files, convert them through the text reader and writer", RunText},
   };
   return kCommands;
 }
