@@ -47,13 +47,7 @@ BOOL GetFileAttributesExW(LPCWSTR lpFileName, GET_FILEEX_INFO_LEVELS fInfoLevelI
   std::string path;
   detail::FileFacts facts;
   if (!FactsOf(lpFileName, &path, &facts)) return FALSE;
-  auto* data = static_cast<WIN32_FILE_ATTRIBUTE_DATA*>(lpFileInformation);
-  data->dwFileAttributes = facts.attributes;
-  data->ftCreationTime = facts.creation;
-  data->ftLastAccessTime = facts.lastAccess;
-  data->ftLastWriteTime = facts.lastWrite;
-  data->nFileSizeHigh = static_cast<DWORD>(facts.size >> 32);
-  data->nFileSizeLow = static_cast<DWORD>(facts.size);
+  detail::CopyFacts(facts, static_cast<WIN32_FILE_ATTRIBUTE_DATA*>(lpFileInformation));
   return TRUE;
 }
 

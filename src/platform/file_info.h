@@ -22,6 +22,18 @@ struct FileFacts {
 // the failed lstat.
 int FactsOfPath(const std::string& posixPath, FileFacts* facts);
 
+// Copies the facts into a Win32 record with the attribute, time and size fields of
+// WIN32_FILE_ATTRIBUTE_DATA (WIN32_FIND_DATAW has the same fields).
+template <class Record>
+void CopyFacts(const FileFacts& facts, Record* record) {
+  record->dwFileAttributes = facts.attributes;
+  record->ftCreationTime = facts.creation;
+  record->ftLastAccessTime = facts.lastAccess;
+  record->ftLastWriteTime = facts.lastWrite;
+  record->nFileSizeHigh = static_cast<DWORD>(facts.size >> 32);
+  record->nFileSizeLow = static_cast<DWORD>(facts.size);
+}
+
 // A POSIX time as a FILETIME; times before 1601 become 0.
 FILETIME FileTimeOf(const timespec& time);
 

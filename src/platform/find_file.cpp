@@ -53,12 +53,7 @@ class FindSearch : public detail::HandleObject {
   static void Fill(const std::u16string& name, const detail::FileFacts& facts,
                    WIN32_FIND_DATAW* data) {
     std::memset(data, 0, sizeof *data);
-    data->dwFileAttributes = facts.attributes;
-    data->ftCreationTime = facts.creation;
-    data->ftLastAccessTime = facts.lastAccess;
-    data->ftLastWriteTime = facts.lastWrite;
-    data->nFileSizeHigh = static_cast<DWORD>(facts.size >> 32);
-    data->nFileSizeLow = static_cast<DWORD>(facts.size);
+    detail::CopyFacts(facts, data);
     const std::size_t length = std::min<std::size_t>(name.size(), MAX_PATH - 1);
     std::copy_n(name.data(), length, data->cFileName);
   }
