@@ -182,6 +182,8 @@ class VYN_API VynStringInternal {
   static const MCHAR* ToUTF16Ref(const VynString& str);
   // A string sharing the block behind ref (adds a reference); null for a null ref.
   static VynString FromRef(const void* ref);
+  // A string that takes over the caller's reference to data (none is added).
+  static VynString Adopt(VynStringData* data) noexcept;
   // Add / release one reference of the block behind ref; return the new count, 0 for null.
   static LONG IncRef(const void* ref) noexcept;
   static LONG DecRef(const void* ref) noexcept;

@@ -22,6 +22,10 @@ constexpr std::size_t kMaxSize = std::numeric_limits<std::size_t>::max();
 constexpr std::size_t kLargestRead = std::size_t(1) << 20;
 // Bytes kept before the read position when a fill drops what was read.
 constexpr std::size_t kKeptBeforePosition = 4;
+// A source the reader opened itself and nobody else reads is read at least this much at a time:
+// the text does not depend on the size of the reads (a Ctrl-Z ends it for good), and fewer, larger
+// reads cost far less than one system call per read-buffer size.
+constexpr std::size_t kOwnedSourceRead = 64 * 1024;
 // Detection looks at no fewer bytes than this.
 constexpr std::size_t kSmallestSample = 8;
 
@@ -191,6 +195,9 @@ std::size_t Reader::Engine::Fill(const Reader& r, std::size_t request) {
   }
   const std::size_t unit = UnitSize(r);
   request = std::max(request, unit);
+  if (r.m_share != nullptr && r.m_share->owns && r.m_share->readers.load() == 1) {
+    request = std::max(request, kOwnedSourceRead);
+  }
   if (unit == 2) request = RoundUpToEven(request);
   SyncSharedSource(r);
   ReadSource(r, request);

@@ -55,11 +55,12 @@ struct TextSpan {
   std::size_t lineFeeds = 0;
 };
 
-// Steps over whole characters of bytes bytes. stopAtZero ends the walk at a zero unit;
-// a character that does not fit ends it too, unless takeIncomplete makes it one character of
-// the bytes that are left.
+// Steps over whole characters of bytes bytes, starting characters only below limit (so the last
+// one may end beyond it). stopAtZero ends the walk at a zero unit; a character that does not fit
+// in bytes ends it too, unless takeIncomplete makes it one character of the bytes that are left.
+// Runs of ASCII and single-byte text are counted a word at a time.
 TextSpan StepText(const TextCodec& codec, const std::uint8_t* data, std::size_t bytes,
-                  bool stopAtZero, bool takeIncomplete);
+                  bool stopAtZero, bool takeIncomplete, std::size_t limit = SIZE_MAX);
 
 // Whether the character of length bytes at data is an LF.
 inline bool IsLineFeed(const TextCodec& codec, const std::uint8_t* data, std::size_t length) {

@@ -75,6 +75,10 @@ struct Reader::Engine {
   // Reads the next character (moving past it unless peek): code receives its code point, or
   // detail::kMalformed. False when nothing is left.
   static bool NextCode(const Reader& r, bool peek, std::uint32_t& code);
+  // The chunk of take bytes at the position when it is well-formed UTF-8 ending on a character
+  // boundary: converted once, straight to UTF-16, and read past (true). False, nothing changed,
+  // for anything else; the general path then steps and keeps the bytes as they are.
+  static bool TakeWellFormedUtf8(const Reader& r, std::size_t take, bool trimLineEnd, VynString& text);
   // Moves the position over bytes bytes holding chars characters and lineFeeds LFs.
   static void Advance(const Reader& r, std::size_t bytes, std::size_t chars,
                       std::size_t lineFeeds);

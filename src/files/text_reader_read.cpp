@@ -134,25 +134,37 @@ VynString Reader::ReadChunk(std::size_t bytes, bool trimLineEnd) {
   const std::size_t unit = codec.UnitSize();
   std::size_t take = std::min(bytes, Engine::Remaining(*this));
   take -= take % unit;
+  if (codec.form == detail::TextForm::Utf8) {
+    VynString text;
+    if (Engine::TakeWellFormedUtf8(*this, take, trimLineEnd, text)) return text;
+  }
 
   // Whole characters up to take, the last one finished; at least one when bytes asks for any.
   detail::TextSpan span;
-  while (span.bytes < take || (bytes != 0 && span.chars == 0)) {
+  const std::size_t limit = bytes != 0 && take == 0 ? 1 : take;
+  while (span.bytes < limit) {
     const std::size_t avail = Engine::Remaining(*this);
     if (span.bytes >= avail) break;
-    const std::uint8_t* at = Engine::Current(*this) + span.bytes;
+    const std::uint8_t* data = Engine::Current(*this);
+    const detail::TextSpan more =
+        detail::StepText(codec, data + span.bytes, avail - span.bytes, false, false, limit - span.bytes);
+    span.bytes += more.bytes;
+    span.chars += more.chars;
+    span.lineFeeds += more.lineFeeds;
+    if (span.bytes >= limit) break;
+    // The buffer ends before take, or inside the next character.
     const std::size_t left = avail - span.bytes;
-    std::size_t length = detail::CharLength(codec, at, left);
-    if (length > left) {
-      if (Engine::CanFill(*this)) {
-        Engine::Fill(*this, std::max(m_readBufferSize, length - left));
-        continue;
-      }
-      length = left;  // cut short by the end of the text
+    if (Engine::CanFill(*this)) {
+      const std::size_t needed = left == 0 ? 0 : detail::CharLength(codec, data + span.bytes, left) - left;
+      Engine::Fill(*this, std::max(m_readBufferSize, needed));
+      continue;
     }
-    if (detail::IsLineFeed(codec, at, length)) ++span.lineFeeds;
-    span.bytes += length;
-    ++span.chars;
+    if (left == 0) break;
+    const detail::TextSpan cut = detail::StepText(codec, data + span.bytes, left, false, true, 1);
+    span.bytes += cut.bytes;
+    span.chars += cut.chars;
+    span.lineFeeds += cut.lineFeeds;
+    break;
   }
   // A byte left over at the very end of UTF-16 text is no unit and never will be: it goes with
   // the chunk before it, as the malformed character it is to ReadChar, so that the text can end.

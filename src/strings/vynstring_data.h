@@ -58,6 +58,11 @@ VynStringData* Allocate(UINT encoding, std::size_t bufferBytes);
 // A new block holding len units of s and one zero unit.
 VynStringData* FromUnits(UINT encoding, const void* s, std::size_t len);
 
+// A new block whose primary form is the UTF-16 text of the len bytes of well-formed UTF-8 at s;
+// null (nothing allocated) when the bytes are not well-formed UTF-8. units receives the UTF-16
+// length. Readers that know their text is UTF-8 and will be used as UTF-16 convert once here.
+VynStringData* FromWellFormedUTF8(const char* s, std::size_t len, std::size_t& units);
+
 void AddRef(VynStringData* data) noexcept;
 // Releases one reference; frees the block and its forms with the last one. Returns the new count.
 std::uint32_t Release(VynStringData* data) noexcept;

@@ -28,6 +28,8 @@ VynString VynStringInternal::FromRef(const void* ref) {
   return VynString(data);
 }
 
+VynString VynStringInternal::Adopt(VynStringData* data) noexcept { return VynString(data); }
+
 LONG VynStringInternal::IncRef(const void* ref) noexcept {
   if (!ref) return 0;
   VynStringData* data = SB::OwnerOf(ref);

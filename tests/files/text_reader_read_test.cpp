@@ -244,6 +244,11 @@ TEST(TextReaderRead, EveryWayOfReadingCountsTheSame) {
       {"UTF-16 BE with a byte left over", "\xFE\xFF" + Utf16Bytes(u"\u65e5\u772c\n\u0d00", true) + "\n", 0},
       {"UTF-16 LE with lone surrogates", "\xFF\xFE" + Utf16Bytes(u"a\xD800\n\xDC00" u"b\xD83D"), 0},
       {"malformed UTF-8", "a\x80\xE2\x82\n\xF8\x88\x80\x80\x80\xFE\xC3", 65001},
+      // Well-formed lines take the converting path, malformed ones the stepping path.
+      {"UTF-8 four-byte characters among malformed lines",
+       "\xF0\x9F\x98\x80a\r\n\xC3\xA9\xE6\x97\xA5\n\x80\xF0\x9F\x98\x80\n\xF0\x9F\x98\x80\r\r\n" +
+           std::string(40, 'x') + "\xF0\x9F\x98\x80\n",
+       65001},
       {"Shift_JIS with stray lead bytes", "\x93\n\x81\x20\x93", 932},
       {"zero characters", std::string("a\0b\nc\0", 7), 1252},
   };
