@@ -66,6 +66,13 @@ using HLOCAL = HANDLE;
 
 #define INVALID_HANDLE_VALUE (reinterpret_cast<HANDLE>(static_cast<LONG_PTR>(-1)))
 
+// Results of waiting on an object, and the timeout that never expires.
+inline constexpr DWORD WAIT_OBJECT_0 = 0x00000000;
+inline constexpr DWORD WAIT_ABANDONED = 0x00000080;  // the owner ended holding it; now the caller's
+inline constexpr DWORD WAIT_TIMEOUT = 0x00000102;
+inline constexpr DWORD WAIT_FAILED = 0xFFFFFFFF;
+inline constexpr DWORD INFINITE = 0xFFFFFFFF;
+
 // Geometry records of the window and drawing interfaces.
 struct RECT {
   LONG left;

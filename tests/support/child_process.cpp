@@ -2,6 +2,7 @@
 
 #include "support/child_process.h"
 
+#include <fcntl.h>
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -83,10 +84,7 @@ ChildResult RunChild(const std::string& program, const std::vector<std::string>&
   }
   ChildResult result{0, ReadAll(pipeFds[0])};
   close(pipeFds[0]);
-  int status = 0;
-  while (waitpid(pid, &status, 0) < 0 && errno == EINTR) {
-  }
-  result.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+  result.exitCode = WaitForChild(pid);
   return result;
 }
 
@@ -102,6 +100,34 @@ testing::AssertionResult RunCurrentTestInChild(const EnvironmentVariables& env) 
   if (child.exitCode == 0 && ranOne) return testing::AssertionSuccess();
   return testing::AssertionFailure() << "child run of " << name << " exited with " << child.exitCode
                                      << ":\n" << child.output;
+}
+
+int StartCurrentTestInChild(const EnvironmentVariables& env) {
+  const testing::TestInfo* test = testing::UnitTest::GetInstance()->current_test_info();
+  if (!test) return -1;
+  EnvironmentVariables childEnv = env;
+  childEnv.emplace_back(kChildMarker, "1");
+  std::vector<std::string> argTexts{"vyn_test_child",
+                                    std::string("--gtest_filter=") + test->test_suite_name() + "." + test->name()};
+  std::vector<std::string> envTexts = ChildEnvironment(childEnv);
+  std::vector<char*> argv = PointersTo(argTexts);
+  std::vector<char*> envp = PointersTo(envTexts);
+  posix_spawn_file_actions_t actions;
+  posix_spawn_file_actions_init(&actions);
+  posix_spawn_file_actions_addopen(&actions, STDOUT_FILENO, "/dev/null", O_WRONLY, 0);
+  posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
+  pid_t pid = -1;
+  const int spawnError = posix_spawn(&pid, "/proc/self/exe", &actions, nullptr, argv.data(), envp.data());
+  posix_spawn_file_actions_destroy(&actions);
+  return spawnError == 0 ? pid : -1;
+}
+
+int WaitForChild(int pid) {
+  int status = 0;
+  while (waitpid(pid, &status, 0) < 0) {
+    if (errno != EINTR) return -1;
+  }
+  return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
 }
 
 bool InChildProcess() {

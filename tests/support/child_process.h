@@ -32,6 +32,13 @@ ChildResult RunChild(const std::string& program, const std::vector<std::string>&
 // two runs apart with InChildProcess().
 testing::AssertionResult RunCurrentTestInChild(const EnvironmentVariables& env);
 
+// Starts the running test again in a new process as RunCurrentTestInChild does, without
+// waiting for it and with its output discarded. Returns its process id, -1 on failure.
+int StartCurrentTestInChild(const EnvironmentVariables& env);
+// Waits for a child started by StartCurrentTestInChild: its exit status, or 128 + the signal
+// number when a signal ended it.
+int WaitForChild(int pid);
+
 // True inside a child started by RunCurrentTestInChild.
 bool InChildProcess();
 

@@ -25,5 +25,6 @@ std::span<const Command> Commands();
 // The commands themselves.
 int RunConvert(Arguments args);
 int RunText(Arguments args);
+int RunIni(Arguments args);
 
 }  // namespace vyntool

@@ -22,6 +22,13 @@ VYN_API DWORD GetEnvironmentVariableW(LPCWSTR name, LPWSTR buffer, DWORD size);
 // empty name or one containing '='; FALSE with ERROR_ENVVAR_NOT_FOUND when removing a variable
 // that is not set; FALSE with the error of the failed system call otherwise.
 VYN_API BOOL SetEnvironmentVariableW(LPCWSTR name, LPCWSTR value);
+// Copies src into dst with every %NAME% of a set variable replaced by its value (names matched as
+// GetEnvironmentVariableW matches them). A reference to an unset variable stays as written, and
+// scanning goes on after its closing '%'; a '%' without a closing one is copied. Returns the size
+// of the whole result in units, terminator included. When that exceeds size, dst receives the
+// first size - 1 units of the result (never half a surrogate pair) and a terminator, and the last
+// error is ERROR_INSUFFICIENT_BUFFER; a null dst or size 0 only measures. A null src is empty.
+VYN_API DWORD ExpandEnvironmentStringsW(LPCWSTR src, LPWSTR dst, DWORD size);
 
 }  // namespace win32
 
