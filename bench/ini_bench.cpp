@@ -8,7 +8,9 @@
 
 #include <QSettings>
 #include <QString>
+#include <chrono>
 #include <cstdio>
+#include <thread>
 #include <fstream>
 #include <random>
 #include <string>
@@ -30,6 +32,8 @@ const std::string& SampleFile() {
       for (int k = 0; k < kKeys; ++k) out << "Key" << k << "=C:\\Program Files\\Value " << s << "-" << k << "\r\n";
     }
     std::atexit([] { std::remove(("/tmp/vyn_bench_ini_" + std::to_string(getpid()) + ".ini").c_str()); });
+    // An unchanged file, as settings files are between writes: older than its clock's step.
+    std::this_thread::sleep_for(std::chrono::milliseconds(200));
     return file;
   }();
   return path;

@@ -53,11 +53,12 @@ struct DetectionCache {
   std::unordered_map<std::u16string, std::pair<win32::FileStamp, bool>> answers;
 };
 
+// A file that cannot be looked at (missing above all) is read under its own name.
 bool PlatformReadsDirectly(const MCHAR* file) {
   static DetectionCache* cache = new DetectionCache;
   win32::FileStamp stamp;
   BOOL settled = FALSE;
-  if (!win32::GetFileStampW(file, &stamp, &settled)) return DetectPlatformReadsDirectly(file);
+  if (!win32::GetFileStampW(file, &stamp, &settled)) return true;
   const std::u16string name(file);
   if (settled) {
     std::lock_guard<std::mutex> hold(cache->lock);
@@ -141,8 +142,7 @@ std::u16string MakeUtf16Copy(const MCHAR* file) {
 }
 
 ReadableCopy::ReadableCopy(const MCHAR* file) : m_file(file) {
-  if (file == nullptr || !win32::PathFileExistsW(file)) return;
-  if (PlatformReadsDirectly(file)) return;
+  if (file == nullptr || PlatformReadsDirectly(file)) return;
   m_copy = MakeUtf16Copy(file);
 }
 

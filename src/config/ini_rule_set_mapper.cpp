@@ -3,8 +3,8 @@
 #include "vynutil/ini_rule_set_mapper.h"
 
 #include <algorithm>
+#include <string_view>
 
-#include "config/wide_regex.h"
 #include "vynutil/env_ini.h"
 #include "vynutil/path.h"
 #include "win32/profile.h"
@@ -15,10 +15,22 @@ namespace {
 
 using Rule = WindowsInitializationFileRule;
 
-// A project file of the application: main rules whatever its folder.
+// A project file of the application: main rules whatever its folder. The same answer as a
+// whole-text, case-insensitive match of ".*\.vxp$" (whose "." matches no line terminator),
+// without running a regular expression on every INI call.
 bool IsProjectFile(const std::u16string& fileKey) {
-  static const std::wregex project = vyn::config::CompileRegex(uR"(.*\.vxp$)", true);
-  return vyn::config::RegexMatchesWhole(project, fileKey);
+  constexpr std::u16string_view kSuffix = u".vxp";
+  if (fileKey.size() < kSuffix.size()) return false;
+  for (const char16_t unit : fileKey) {
+    if (unit == u'\n' || unit == u'\r' || unit == 0x2028 || unit == 0x2029) return false;
+  }
+  const std::size_t start = fileKey.size() - kSuffix.size();
+  for (std::size_t i = 0; i < kSuffix.size(); ++i) {
+    char16_t unit = fileKey[start + i];
+    if (unit >= u'A' && unit <= u'Z') unit = static_cast<char16_t>(unit + 32);
+    if (unit != kSuffix[i]) return false;
+  }
+  return true;
 }
 
 // The current text of a key, read with a buffer doubled from 260 units while it may be cut.
