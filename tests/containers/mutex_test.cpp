@@ -72,7 +72,7 @@ TEST(AutoMutex, AnAbandonedMutexIsReleasedByItsGuard) {
   MutexObject mutex(UniqueName("auto-abandoned").c_str());
   std::thread([&] { EXPECT_EQ(mutex.Acquire(0), WAIT_OBJECT_0); }).join();  // ends holding it
   {
-    AutoMutex guard(mutex, 1000);
+    AutoMutex guard(mutex, INFINITE);
     EXPECT_EQ(guard.GetWaitResult(), WAIT_ABANDONED);
   }
   std::thread([&] {
