@@ -7,6 +7,7 @@
 
 #include <cerrno>
 
+#include "file_stamp_settle.h"
 #include "syscalls.h"
 #include "win32/errno_map.h"
 #include "win32/last_error.h"
@@ -19,6 +20,16 @@ namespace {
 LONGLONG Nanoseconds(const timespec& t) { return static_cast<LONGLONG>(t.tv_sec) * 1000000000LL + t.tv_nsec; }
 
 }  // namespace
+
+namespace detail {
+
+bool StampSettled(long long modified, long long changed, long long seen) {
+  const bool fine = modified % 1000000000LL != 0 || changed % 1000000000LL != 0;
+  const long long step = fine ? 50000000LL : 2100000000LL;
+  return seen - modified > step && seen - changed > step;
+}
+
+}  // namespace detail
 
 BOOL GetFileStampW(LPCWSTR path, FileStamp* stamp, BOOL* settled) {
   if (path == nullptr || stamp == nullptr) {
@@ -36,14 +47,9 @@ BOOL GetFileStampW(LPCWSTR path, FileStamp* stamp, BOOL* settled) {
   stamp->modified = Nanoseconds(info.st_mtim);
   stamp->changed = Nanoseconds(info.st_ctim);
   if (settled != nullptr) {
-    // File systems that keep nanoseconds take their times from the kernel's tick (milliseconds);
-    // those that keep whole seconds (or two, for FAT) need a window to match.
     timespec now{};
     clock_gettime(CLOCK_REALTIME, &now);
-    const bool fine = stamp->modified % 1000000000LL != 0 || stamp->changed % 1000000000LL != 0;
-    const LONGLONG step = fine ? 50000000LL : 2100000000LL;
-    const LONGLONG seen = Nanoseconds(now);
-    *settled = seen - stamp->modified > step && seen - stamp->changed > step ? TRUE : FALSE;
+    *settled = detail::StampSettled(stamp->modified, stamp->changed, Nanoseconds(now)) ? TRUE : FALSE;
   }
   SetLastError(ERROR_SUCCESS);
   return TRUE;

@@ -15,6 +15,7 @@
 #include <unordered_map>
 #include <utility>
 
+#include "file_stamp_settle.h"
 #include "path_errors.h"
 #include "syscalls.h"
 #include "win32/codepage.h"
@@ -62,12 +63,8 @@ FileStamp StampOf(const struct stat& info) {
 
 // A copy read at time seen can be trusted for as long as the stamps stay when the file's last
 // change lies more than one clock step before seen: any later change then gets a later time.
-// File systems that keep nanoseconds take their times from the kernel's tick (milliseconds);
-// those that keep whole seconds (or two, for FAT) get a window to match.
 bool Settled(const FileStamp& stamp, Nanoseconds seen) {
-  const bool fine = stamp.modified % 1000000000LL != 0 || stamp.changed % 1000000000LL != 0;
-  const Nanoseconds step = fine ? 50000000LL : 2100000000LL;
-  return seen - stamp.modified > step && seen - stamp.changed > step;
+  return StampSettled(stamp.modified, stamp.changed, seen);
 }
 
 struct FileIdHash {
@@ -169,7 +166,7 @@ DWORD ReadAll(int fd, std::size_t expected, std::string* bytes) {
   std::size_t total = 0;
   for (;;) {
     if (total == bytes->size()) {
-      if (bytes->size() > ProfileDocument::kMaxBytes) return kErrorFileTooLarge;
+      if (bytes->size() > ProfileDocument::kMaxBytes) return ERROR_FILE_TOO_LARGE;
       bytes->resize(bytes->size() * 2);
     }
     const ssize_t got = calls.read(fd, bytes->data() + total, bytes->size() - total);
@@ -181,7 +178,7 @@ DWORD ReadAll(int fd, std::size_t expected, std::string* bytes) {
     total += static_cast<std::size_t>(got);
   }
   bytes->resize(total);
-  return total > ProfileDocument::kMaxBytes ? kErrorFileTooLarge : ERROR_SUCCESS;
+  return total > ProfileDocument::kMaxBytes ? ERROR_FILE_TOO_LARGE : ERROR_SUCCESS;
 }
 
 Loaded LoadOnce(const std::string& path) {
@@ -199,7 +196,7 @@ Loaded LoadOnce(const std::string& path) {
     loaded.error = ErrorFromErrno(errno);
   } else if ((loaded.error = CheckRegular(before)) == ERROR_SUCCESS) {
     if (static_cast<std::size_t>(before.st_size) > ProfileDocument::kMaxBytes) {
-      loaded.error = kErrorFileTooLarge;
+      loaded.error = ERROR_FILE_TOO_LARGE;
     } else {
       loaded.error = ReadAll(fd, static_cast<std::size_t>(before.st_size), &loaded.bytes);
     }
@@ -252,7 +249,7 @@ ProfileRead ReadProfile(const std::string& posixPath) {
     } else {
       result.document = ProfileDocument::Parse(std::move(loaded.bytes), codePage);
       if (!result.document) {
-        result.error = kErrorFileTooLarge;
+        result.error = ERROR_FILE_TOO_LARGE;
         return result;
       }
     }

@@ -20,14 +20,11 @@
 
 namespace win32::detail {
 
-// Windows' code for a file beyond a size limit.
-inline constexpr DWORD kErrorFileTooLarge = 223;  // ERROR_FILE_TOO_LARGE
-
 struct ProfileRead {
   std::shared_ptr<const ProfileDocument> document;  // null when there is no readable file
   // ERROR_SUCCESS with a document; otherwise why there is none: ERROR_FILE_NOT_FOUND,
   // ERROR_PATH_NOT_FOUND (missing folder), ERROR_ACCESS_DENIED (a folder or other non-file, or
-  // no permission), kErrorFileTooLarge, ERROR_NOT_ENOUGH_MEMORY, or the error of the system call.
+  // no permission), ERROR_FILE_TOO_LARGE, ERROR_NOT_ENOUGH_MEMORY, or the error of the system call.
   DWORD error = 0;
 };
 

@@ -126,7 +126,7 @@ BOOL WriteProfile(const MCHAR* fileName, const Edit& edit) {
     std::optional<std::string> edited = edit(current.document.get());
     if (!edited) return Fail(ERROR_NO_UNICODE_TRANSLATION);
     std::string bytes = std::move(*edited);
-    if (bytes.size() > ProfileDocument::kMaxBytes) return Fail(detail::kErrorFileTooLarge);
+    if (bytes.size() > ProfileDocument::kMaxBytes) return Fail(ERROR_FILE_TOO_LARGE);
     if (current.document && bytes == current.document->bytes()) {
       SetLastError(ERROR_SUCCESS);
       return TRUE;
@@ -215,7 +215,7 @@ BOOL WritePrivateProfileStructW(LPCWSTR lpszSection, LPCWSTR lpszKey, const void
   }
   // Two digits a byte, in a file this layer could still read back.
   if (2 * (std::uint64_t{uSizeStruct} + 1) > ProfileDocument::kMaxBytes) {
-    return Fail(detail::kErrorFileTooLarge);
+    return Fail(ERROR_FILE_TOO_LARGE);
   }
   try {
     const std::u16string value = detail::profile::EncodeStruct(lpStruct, uSizeStruct);

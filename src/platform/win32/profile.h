@@ -53,9 +53,6 @@
 
 namespace win32 {
 
-// Set by GetPrivateProfileStructW when the stored data has another length than asked for.
-inline constexpr DWORD ERROR_BAD_LENGTH = 24;
-
 // The value of lpKeyName in section lpAppName, without surrounding blanks and one pair of
 // surrounding quotes. When the file, the section or the key is missing, the default: lpDefault
 // without trailing spaces ("" when null). The text is cut to nSize - 1 units and ended with a
