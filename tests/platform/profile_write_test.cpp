@@ -252,7 +252,9 @@ TEST(ProfileWrite, KeepsLinksAndPermissions) {
   fs::permissions(dir.path() / "real/t.ini", fs::perms(0640));
   const std::string target = (dir.path() / "real/t.ini").string();
   const bool superuser = geteuid() == 0;  // may give the file to another owner
-  if (superuser) ASSERT_EQ(chown(target.c_str(), 65534, 65534), 0);
+  if (superuser) {
+    ASSERT_EQ(chown(target.c_str(), 65534, 65534), 0);
+  }
   fs::create_symlink("real/t.ini", dir.path() / "link.ini");
   const std::u16string link = dir.File("link.ini");
   ASSERT_TRUE(Set(u"s", u"k", u"2", link.c_str()));
@@ -261,7 +263,9 @@ TEST(ProfileWrite, KeepsLinksAndPermissions) {
   EXPECT_EQ(fs::status(target).permissions(), fs::perms(0640));
   struct stat info {};
   stat(target.c_str(), &info);
-  if (superuser) EXPECT_TRUE(info.st_uid == 65534 && info.st_gid == 65534);
+  if (superuser) {
+    EXPECT_TRUE(info.st_uid == 65534 && info.st_gid == 65534);
+  }
   EXPECT_EQ(Value(u"s", u"k", dir.File("real/t.ini")), u"2");
   EXPECT_EQ(FilesIn(dir.path() / "real"), 1u);
 }
