@@ -1,18 +1,14 @@
 // Binary streams over Win32 file handles: ownership, the end-of-file flag, and failures reported
-// through LastError() as system messages: refused calls, faults injected through the platform's
-// system-call table, and a process file-size limit, which must not end the process.
+// through LastError() as system messages: refused calls and faults injected through the
+// platform's system-call table (the file-size limit itself is the platform's file-handle test).
 
 #include <gtest/gtest.h>
-
-#include <signal.h>
-#include <sys/resource.h>
 
 #include <cerrno>
 #include <functional>
 #include <string>
 
 #include "files/binary_stream_test_support.h"
-#include "support/child_process.h"
 #include "support/temp_dir.h"
 #include "syscalls.h"
 #include "win32/file_handle.h"
@@ -123,28 +119,4 @@ TEST(BinaryStreamWin32, FailuresLeaveTheirSystemMessage) {
   win32::CloseHandle(handle);
   EXPECT_EQ(ReadText(*stream, 4), "");
   EXPECT_EQ(TextOf(stream->LastError()), kInvalidHandle);
-}
-
-TEST(BinaryStreamWin32, FileSizeLimitGivesDiskFullWithoutEndingTheProcess) {
-  if (!vyn::test::InChildProcess()) {
-    // The limit, and the signal the kernel would send, stay in a child of this program.
-    ASSERT_TRUE(vyn::test::RunCurrentTestInChild({}));
-    return;
-  }
-  vyn::test::TempDir dir;
-  const rlimit limit{1000, 1000};
-  ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
-  StreamPtr stream(BinaryStream::FromFilename(vyn::test::StringOf(dir.File("limited")),
-                                              BinaryStream::ParseStreamMode(u"wb"), nullptr));
-  ASSERT_NE(stream, nullptr);
-  EXPECT_EQ(WriteText(*stream, std::string(4096, 'z')), 1000u);
-  EXPECT_EQ(TextOf(stream->LastError()), kDiskFull);
-  EXPECT_EQ(stream->Seek(5000, 0), 5000);
-  stream->Truncate();
-  EXPECT_EQ(TextOf(stream->LastError()), kDiskFull);
-  stream.reset();
-  EXPECT_EQ(vyn::test::FileContents(dir.path() / "limited"), std::string(1000, 'z'));
-  sigset_t pending;
-  sigpending(&pending);
-  EXPECT_FALSE(sigismember(&pending, SIGXFSZ)) << "no signal is left waiting";
 }

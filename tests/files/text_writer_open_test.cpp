@@ -39,10 +39,7 @@ TEST(TextWriterOpen, NewFilesAndAppending) {
     UINT inUse;         // Encoding() after Open
     std::string after;  // the file after writing e acute and LF (as CR LF)
   } rows[] = {
-      {"UTF-8 mark", false, "old", 0x2000FDE9, 0x2000FDE9, "\xEF\xBB\xBF\xC3\xA9\r\n"},
-      {"UTF-16LE mark", false, "old", 0x2000FDF4, 0x2000FDF4, B("\xFF\xFE\xE9\0\r\0\n\0")},
-      {"UTF-16BE mark", false, "old", 0xA000FDF4, 0xA000FDF4, B("\xFE\xFF\0\xE9\0\r\0\n")},
-      {"UTF-8", false, "old", 65001, 65001, "\xC3\xA9\r\n"},
+      // New files: the marks of the UTF encodings are the round-trip test's; these are the rest.
       {"code pages get no mark", false, "old", 0x200004E4, 0x200004E4, "\xE9\r\n"},
       {"prefer UTF-8", false, "old", 0x100004E4, 65001, "\xC3\xA9\r\n"},
       {"prefer UTF-8, mark", false, "", 0x300004E4, 0x2000FDE9, "\xEF\xBB\xBF\xC3\xA9\r\n"},

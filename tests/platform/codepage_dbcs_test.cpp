@@ -6,12 +6,13 @@
 
 #include <string>
 
-#include "win32/codepage.h"
-#include "win32/last_error.h"
+#include "codepage_test_support.h"
 
 namespace {
 
 using namespace win32;
+using codepage_test::Decode;
+using codepage_test::Encode;
 
 struct DoubleBytePage {
   UINT codePage;
@@ -25,27 +26,6 @@ const DoubleBytePage kPages[] = {
     {949, "windows-949-2000", u'?'},
     {950, "windows-950-2000", u'?'},
 };
-
-std::u16string Decode(UINT cp, const std::string& s, DWORD flags = 0) {
-  const int n = static_cast<int>(s.size());
-  const int needed = MultiByteToWideChar(cp, flags, s.data(), n, nullptr, 0);
-  std::u16string out(needed, u'\0');
-  if (needed > 0) {
-    EXPECT_EQ(MultiByteToWideChar(cp, flags, s.data(), n, out.data(), needed), needed);
-  }
-  return out;
-}
-
-std::string Encode(UINT cp, const std::u16string& s, DWORD flags = 0) {
-  const int n = static_cast<int>(s.size());
-  const int needed = WideCharToMultiByte(cp, flags, s.data(), n, nullptr, 0, nullptr, nullptr);
-  std::string out(needed, '\0');
-  if (needed > 0) {
-    EXPECT_EQ(WideCharToMultiByte(cp, flags, s.data(), n, out.data(), needed, nullptr, nullptr),
-              needed);
-  }
-  return out;
-}
 
 // Lead bytes as ICU's converter has them, in IsDBCSLeadByteEx and in GetCPInfo's ranges. Every
 // lead/trail pair: where ICU (with its fallbacks) has a character, the same one; where it has

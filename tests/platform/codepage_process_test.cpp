@@ -4,51 +4,45 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
-#include <optional>
 #include <string>
 #include <thread>
-#include <vector>
 
-#include "win32/codepage.h"
-#include "win32/last_error.h"
+#include "codepage_test_support.h"
+#include "scoped_env.h"
 
 namespace {
 
 using namespace win32;
 
+// Puts the process code pages back to the environment's once everything else is restored.
+struct Reload {
+  ~Reload() {
+    SetProcessCodePages(0, 0);
+    ReloadProcessCodePages();
+  }
+};
+
 // Sets environment variables for one test and puts everything back afterwards (the test main
 // pins TAVLO_PLATFORM_ACP=1252 and TAVLO_PLATFORM_OEMCP=437).
 class Environment {
  public:
-  Environment() {
-    for (const char* name : kNames) {
-      const char* value = std::getenv(name);
-      saved_.push_back(value ? std::optional<std::string>(value) : std::nullopt);
-    }
-  }
-  ~Environment() {
-    for (std::size_t i = 0; i < std::size(kNames); ++i) {
-      if (saved_[i])
-        setenv(kNames[i], saved_[i]->c_str(), 1);
-      else
-        unsetenv(kNames[i]);
-    }
-    SetProcessCodePages(0, 0);
-    ReloadProcessCodePages();
-  }
   // Sets (or, with null, removes) a variable and makes the next query read the environment.
   void Set(const char* name, const char* value) {
-    if (value)
+    if (value) {
       setenv(name, value, 1);
-    else
+    } else {
       unsetenv(name);
+    }
     ReloadProcessCodePages();
   }
 
  private:
-  static constexpr const char* kNames[] = {"TAVLO_PLATFORM_ACP", "TAVLO_PLATFORM_OEMCP", "LC_ALL",
-                                           "LC_CTYPE", "LANG"};
-  std::vector<std::optional<std::string>> saved_;
+  Reload reload_;  // destroyed last
+  ScopedEnv saved_[5] = {{"TAVLO_PLATFORM_ACP", std::getenv("TAVLO_PLATFORM_ACP")},
+                         {"TAVLO_PLATFORM_OEMCP", std::getenv("TAVLO_PLATFORM_OEMCP")},
+                         {"LC_ALL", std::getenv("LC_ALL")},
+                         {"LC_CTYPE", std::getenv("LC_CTYPE")},
+                         {"LANG", std::getenv("LANG")}};
 };
 
 TEST(CodePageProcess, EnvironmentVariablesChooseTheCodePages) {
@@ -152,9 +146,7 @@ TEST(CodePageProcess, LocaleInfoCodePages) {
                                              {LOCALE_IDEFAULTMACCODEPAGE, row.mac}};
     for (const auto& [type, expected] : types) {
       DWORD value = 0;
-      ASSERT_EQ(GetLocaleInfoW(row.lcid, type | LOCALE_RETURN_NUMBER,
-                               reinterpret_cast<MCHAR*>(&value), 2),
-                2);
+      ASSERT_EQ(GetLocaleInfoW(row.lcid, type | LOCALE_RETURN_NUMBER, reinterpret_cast<MCHAR*>(&value), 2), 2);
       EXPECT_EQ(value, expected);
       MCHAR text[8];
       const int length = GetLocaleInfoW(row.lcid, type, text, 8);
@@ -163,18 +155,12 @@ TEST(CodePageProcess, LocaleInfoCodePages) {
     }
   }
   MCHAR buffer[8];
-  EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, nullptr, 0),
-            2);
+  EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, nullptr, 0), 2);
   EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE, nullptr, 0), 5);
-  SetLastError(0);
-  EXPECT_EQ(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, buffer, 1), 0);
-  EXPECT_EQ(GetLastError(), ERROR_INSUFFICIENT_BUFFER);
-  SetLastError(0);
-  EXPECT_EQ(GetLocaleInfoW(1033, 0x0002 /* LOCALE_SLANGUAGE */, buffer, 8), 0);
-  EXPECT_EQ(GetLastError(), ERROR_INVALID_FLAGS);
-  SetLastError(0);
-  EXPECT_EQ(GetLocaleInfoW(0x1234, LOCALE_IDEFAULTANSICODEPAGE, buffer, 8), 0);
-  EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+  EXPECT_FAILS_WITH(GetLocaleInfoW(1033, LOCALE_IDEFAULTANSICODEPAGE | LOCALE_RETURN_NUMBER, buffer, 1),
+                    ERROR_INSUFFICIENT_BUFFER);
+  EXPECT_FAILS_WITH(GetLocaleInfoW(1033, 0x0002 /* LOCALE_SLANGUAGE */, buffer, 8), ERROR_INVALID_FLAGS);
+  EXPECT_FAILS_WITH(GetLocaleInfoW(0x1234, LOCALE_IDEFAULTANSICODEPAGE, buffer, 8), ERROR_INVALID_PARAMETER);
 }
 
 TEST(CodePageProcess, ThreadLocaleIsPerThread) {
@@ -187,9 +173,7 @@ TEST(CodePageProcess, ThreadLocaleIsPerThread) {
     MCHAR wide[2];
     ASSERT_EQ(MultiByteToWideChar(CP_THREAD_ACP, 0, "\x82\xA0", 2, wide, 2), 1);
     EXPECT_EQ(wide[0], 0x3042);  // HIRAGANA LETTER A in 932
-    SetLastError(0);
-    EXPECT_FALSE(SetThreadLocale(0x1234));
-    EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
+    EXPECT_FAILS_WITH(SetThreadLocale(0x1234), ERROR_INVALID_PARAMETER);
     EXPECT_EQ(GetThreadLocale(), 1041u);
   }).join();
   EXPECT_EQ(GetThreadLocale(), 1033u);

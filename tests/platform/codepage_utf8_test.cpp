@@ -13,8 +13,7 @@
 #include <random>
 #include <string>
 
-#include "win32/codepage.h"
-#include "win32/last_error.h"
+#include "codepage_test_support.h"
 
 namespace {
 
@@ -57,25 +56,8 @@ std::string FastToUtf8(const std::u16string& s) {
   return out;
 }
 
-// The Win32 calls, measured, then converted into a buffer of exactly that size.
-std::u16string Win32ToUtf16(const std::string& s, DWORD flags = 0) {
-  const int n = static_cast<int>(s.size());
-  std::u16string out(MultiByteToWideChar(CP_UTF8, flags, s.data(), n, nullptr, 0), u'\0');
-  if (!out.empty()) {
-    EXPECT_EQ(MultiByteToWideChar(CP_UTF8, flags, s.data(), n, out.data(), out.size()), out.size());
-  }
-  return out;
-}
-
-std::string Win32ToUtf8(const std::u16string& s, DWORD flags = 0) {
-  const int n = static_cast<int>(s.size());
-  std::string out(WideCharToMultiByte(CP_UTF8, flags, s.data(), n, nullptr, 0, nullptr, nullptr), '\0');
-  if (!out.empty()) {
-    EXPECT_EQ(WideCharToMultiByte(CP_UTF8, flags, s.data(), n, out.data(), out.size(), nullptr, nullptr),
-              out.size());
-  }
-  return out;
-}
+std::u16string Win32ToUtf16(const std::string& s) { return codepage_test::Decode(CP_UTF8, s); }
+std::string Win32ToUtf8(const std::u16string& s) { return codepage_test::Encode(CP_UTF8, s); }
 
 // A strict conversion (MB_ERR_INVALID_CHARS / WC_ERR_INVALID_CHARS) measures valid text and
 // fails invalid text with ERROR_NO_UNICODE_TRANSLATION.

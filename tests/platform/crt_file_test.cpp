@@ -14,12 +14,8 @@
 #include "support/temp_dir.h"
 #include "win32/crt_stdio.h"
 
-namespace {
-
 using namespace win32;
 namespace fs = std::filesystem;
-
-}  // namespace
 
 TEST(CrtFile, SeeksAndTellsBeyondFourGigabytes) {
   vyn::test::TempDir dir;

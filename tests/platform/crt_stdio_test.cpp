@@ -5,24 +5,17 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
-#include <fstream>
-#include <sstream>
 #include <string>
 
+#include "file_test_helpers.h"
 #include "support/temp_dir.h"
 #include "syscalls.h"
 #include "win32/path_map.h"
 
 namespace {
 
+using vyn::test::Contents;
 using win32::_wfopen;
-
-std::string Contents(const std::filesystem::path& path) {
-  std::ifstream in(path, std::ios::binary);
-  std::ostringstream out;
-  out << in.rdbuf();
-  return out.str();
-}
 
 bool Write(const std::u16string& path, const char16_t* mode, const std::string& text) {
   FILE* file = _wfopen(path.c_str(), mode);

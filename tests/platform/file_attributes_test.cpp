@@ -14,22 +14,15 @@
 #include <string>
 #include <vector>
 
+#include "file_test_helpers.h"
 #include "support/temp_dir.h"
 #include "win32/find_file.h"
 #include "win32/last_error.h"
 #include "win32/path_map.h"
 
-namespace {
-
 using namespace win32;
 namespace fs = std::filesystem;
-
-void MakeReadOnly(const fs::path& path) {
-  fs::permissions(path, fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write,
-                  fs::perm_options::remove);
-}
-
-}  // namespace
+using vyn::test::MakeReadOnly;
 
 TEST(FileAttributes, PosixEntriesReportWindowsAttributes) {
   vyn::test::TempDir dir;

@@ -58,15 +58,13 @@ LONGLONG Seek(HANDLE file, LONGLONG distance, DWORD method) {
 TEST(FileHandle, DispositionsCreateOpenAndTruncateAsWin32) {
   // CreateFileW documentation, dwCreationDisposition: what each does to a missing and to an
   // existing file, and the last error left on success.
-  struct Row {
+  const struct {
     const char* what;
     bool exists;
-    DWORD disposition;
-    DWORD error;          // last error after the call
+    DWORD disposition, error;  // the last error after the call
     bool opens;
-    const char* after;    // contents afterwards; null: no file
-  };
-  const Row rows[] = {
+    const char* after;  // contents afterwards; null: no file
+  } rows[] = {
       {"CREATE_NEW, missing", false, CREATE_NEW, ERROR_SUCCESS, true, ""},
       {"CREATE_NEW, existing", true, CREATE_NEW, ERROR_FILE_EXISTS, false, "old"},
       {"CREATE_ALWAYS, missing", false, CREATE_ALWAYS, ERROR_SUCCESS, true, ""},
@@ -80,7 +78,7 @@ TEST(FileHandle, DispositionsCreateOpenAndTruncateAsWin32) {
   };
   vyn::test::TempDir dir;
   int n = 0;
-  for (const Row& row : rows) {
+  for (const auto& row : rows) {
     SCOPED_TRACE(row.what);
     const std::string name = "file" + std::to_string(n++);
     const std::u16string path = row.exists ? dir.Write(name, "old") : dir.File(name);
@@ -100,39 +98,27 @@ TEST(FileHandle, RefusalsGiveWin32Codes) {
   vyn::test::TempDir dir;
   const std::u16string file = dir.Write("file.txt", "data");
   fs::create_directory(dir.path() / "folder");
-  struct Row {
+  const struct {
     const char* what;
     std::u16string path;
-    DWORD access;
-    DWORD share;
-    DWORD disposition;
-    DWORD flags;
-    DWORD error;
-  };
-  const Row rows[] = {
-      {"a missing folder", dir.File("no/such.txt"), GENERIC_READ, 0, OPEN_EXISTING, 0,
-       ERROR_PATH_NOT_FOUND},
-      {"a new file in a missing folder", dir.File("no/such.txt"), GENERIC_WRITE, 0, CREATE_NEW, 0,
-       ERROR_PATH_NOT_FOUND},
-      {"a file where a folder should be", dir.File("file.txt/x"), GENERIC_READ, 0, OPEN_EXISTING, 0,
-       ERROR_PATH_NOT_FOUND},
+    DWORD access, share, disposition, error;
+  } rows[] = {
+      {"a missing folder", dir.File("no/such.txt"), GENERIC_READ, 0, OPEN_EXISTING, ERROR_PATH_NOT_FOUND},
+      {"a new file in a missing folder", dir.File("no/such.txt"), GENERIC_WRITE, 0, CREATE_NEW, ERROR_PATH_NOT_FOUND},
+      {"a file where a folder should be", dir.File("file.txt/x"), GENERIC_READ, 0, OPEN_EXISTING, ERROR_PATH_NOT_FOUND},
       // Windows opens no folder as a file, for reading or writing.
-      {"a folder for reading", dir.File("folder"), GENERIC_READ, 0, OPEN_EXISTING, 0,
-       ERROR_ACCESS_DENIED},
-      {"a folder for writing", dir.File("folder"), GENERIC_WRITE, 0, OPEN_ALWAYS, 0,
-       ERROR_ACCESS_DENIED},
-      {"an empty name", u"", GENERIC_READ, 0, OPEN_EXISTING, 0, ERROR_PATH_NOT_FOUND},
-      {"disposition 0", file, GENERIC_READ, 0, 0, 0, ERROR_INVALID_PARAMETER},
-      {"disposition 6", file, GENERIC_READ, 0, 6, 0, ERROR_INVALID_PARAMETER},
-      {"an unknown share bit", file, GENERIC_READ, 0x8, OPEN_EXISTING, 0, ERROR_INVALID_PARAMETER},
-      {"TRUNCATE_EXISTING without write access", file, GENERIC_READ, 0, TRUNCATE_EXISTING, 0,
-       ERROR_INVALID_PARAMETER},
+      {"a folder for reading", dir.File("folder"), GENERIC_READ, 0, OPEN_EXISTING, ERROR_ACCESS_DENIED},
+      {"a folder for writing", dir.File("folder"), GENERIC_WRITE, 0, OPEN_ALWAYS, ERROR_ACCESS_DENIED},
+      {"an empty name", u"", GENERIC_READ, 0, OPEN_EXISTING, ERROR_PATH_NOT_FOUND},
+      {"disposition 0", file, GENERIC_READ, 0, 0, ERROR_INVALID_PARAMETER},
+      {"disposition 6", file, GENERIC_READ, 0, 6, ERROR_INVALID_PARAMETER},
+      {"an unknown share bit", file, GENERIC_READ, 0x8, OPEN_EXISTING, ERROR_INVALID_PARAMETER},
+      {"TRUNCATE_EXISTING without write access", file, GENERIC_READ, 0, TRUNCATE_EXISTING, ERROR_INVALID_PARAMETER},
   };
-  for (const Row& row : rows) {
+  for (const auto& row : rows) {
     SCOPED_TRACE(row.what);
     SetLastError(0);
-    EXPECT_EQ(OpenFile(row.path, row.access, row.share, row.disposition, row.flags),
-              INVALID_HANDLE_VALUE);
+    EXPECT_EQ(OpenFile(row.path, row.access, row.share, row.disposition), INVALID_HANDLE_VALUE);
     EXPECT_EQ(GetLastError(), row.error);
   }
   EXPECT_EQ(CreateFileW(nullptr, GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr),

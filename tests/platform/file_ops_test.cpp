@@ -24,11 +24,7 @@ namespace {
 using namespace win32;
 using vyn::test::Contents;
 namespace fs = std::filesystem;
-
-void MakeReadOnly(const fs::path& path) {
-  fs::permissions(path, fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write,
-                  fs::perm_options::remove);
-}
+using vyn::test::MakeReadOnly;
 
 std::size_t EntriesIn(const fs::path& folder) {
   return static_cast<std::size_t>(std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
@@ -249,29 +245,23 @@ TEST(Folders, CreateAndRemoveOneFolder) {
   dir.Write("new/inside.txt", "x");
   const struct {
     const char* what;
-    BOOL (*call)(const std::u16string&);
+    bool create;  // CreateDirectoryW, else RemoveDirectoryW
     const char* name;
     DWORD error;
   } rows[] = {
-      {"create an existing folder", [](const std::u16string& p) { return CreateDirectoryW(p.c_str(), nullptr); },
-       "new", ERROR_ALREADY_EXISTS},
-      {"create over a file", [](const std::u16string& p) { return CreateDirectoryW(p.c_str(), nullptr); },
-       "file.txt", ERROR_ALREADY_EXISTS},
-      {"create in a missing folder", [](const std::u16string& p) { return CreateDirectoryW(p.c_str(), nullptr); },
-       "a/b", ERROR_PATH_NOT_FOUND},
-      {"remove a full folder", [](const std::u16string& p) { return RemoveDirectoryW(p.c_str()); }, "new",
-       ERROR_DIR_NOT_EMPTY},
-      {"remove a file", [](const std::u16string& p) { return RemoveDirectoryW(p.c_str()); }, "file.txt",
-       ERROR_DIRECTORY},
-      {"remove a missing folder", [](const std::u16string& p) { return RemoveDirectoryW(p.c_str()); }, "gone",
-       ERROR_FILE_NOT_FOUND},
-      {"remove below a missing folder", [](const std::u16string& p) { return RemoveDirectoryW(p.c_str()); },
-       "gone/deeper", ERROR_PATH_NOT_FOUND},
+      {"create an existing folder", true, "new", ERROR_ALREADY_EXISTS},
+      {"create over a file", true, "file.txt", ERROR_ALREADY_EXISTS},
+      {"create in a missing folder", true, "a/b", ERROR_PATH_NOT_FOUND},
+      {"remove a full folder", false, "new", ERROR_DIR_NOT_EMPTY},
+      {"remove a file", false, "file.txt", ERROR_DIRECTORY},
+      {"remove a missing folder", false, "gone", ERROR_FILE_NOT_FOUND},
+      {"remove below a missing folder", false, "gone/deeper", ERROR_PATH_NOT_FOUND},
   };
   for (const auto& row : rows) {
     SCOPED_TRACE(row.what);
     SetLastError(0);
-    EXPECT_FALSE(row.call(dir.File(row.name)));
+    const std::u16string path = dir.File(row.name);
+    EXPECT_FALSE(row.create ? CreateDirectoryW(path.c_str(), nullptr) : RemoveDirectoryW(path.c_str()));
     EXPECT_EQ(GetLastError(), row.error);
   }
   fs::remove(dir.path() / "new/inside.txt");

@@ -1,5 +1,6 @@
 #pragma once
-// Small helpers of the file tests: handles closed at the end of a scope, file contents.
+// Small helpers of the file tests: handles closed at the end of a scope, file contents, read-only
+// files.
 
 #include <filesystem>
 #include <fstream>
@@ -38,6 +39,13 @@ inline std::string Contents(const std::filesystem::path& path) {
   std::ostringstream out;
   out << in.rdbuf();
   return out.str();
+}
+
+// Takes every write permission away, as the read-only attribute does.
+inline void MakeReadOnly(const std::filesystem::path& path) {
+  std::filesystem::permissions(path, std::filesystem::perms::owner_write | std::filesystem::perms::group_write |
+                                         std::filesystem::perms::others_write,
+                               std::filesystem::perm_options::remove);
 }
 
 inline HANDLE OpenFile(const std::u16string& path, DWORD access, DWORD share, DWORD disposition,

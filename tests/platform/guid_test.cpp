@@ -1,4 +1,4 @@
-// CLSIDFromString on the registry form of GUIDs, and LoadLibraryExW's plain form.
+// CLSIDFromString on the registry form of GUIDs.
 
 #include "win32/guid.h"
 
@@ -7,8 +7,6 @@
 #include <cstring>
 #include <string>
 
-#include "win32/last_error.h"
-#include "win32/module.h"
 
 namespace {
 
@@ -60,15 +58,4 @@ TEST(Guid, RefusesEverythingElse) {
     EXPECT_EQ(CLSIDFromString(text, &guid), CO_E_CLASSSTRING);
     EXPECT_TRUE(IsNull(guid));
   }
-}
-
-TEST(Guid, LoadLibraryExWithoutFlagsIsLoadLibrary) {
-  HMODULE module = LoadLibraryExW(u"Riched20.dll", nullptr, 0);
-  ASSERT_NE(module, nullptr);
-  EXPECT_EQ(GetModuleHandleW(u"Riched20.dll"), module);
-  EXPECT_TRUE(FreeLibrary(module));
-  EXPECT_EQ(LoadLibraryExW(u"Riched20.dll", nullptr, 0x2), nullptr);
-  EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
-  EXPECT_EQ(LoadLibraryExW(u"NoSuchModule.dll", nullptr, 0), nullptr);
-  EXPECT_EQ(GetLastError(), ERROR_MOD_NOT_FOUND);
 }

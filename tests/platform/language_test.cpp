@@ -1,46 +1,14 @@
-// GetUserDefaultUILanguage: the environment override and the language of the messages locale.
-// Expected LANGIDs from the Windows language identifier list ([MS-LCID]).
+// GetUserDefaultUILanguage: the environment override and the language of the messages locale;
+// the thread's UI language: its own choice, else the user's default. Expected LANGIDs from the
+// Windows language identifier list ([MS-LCID]).
 
 #include "win32/language.h"
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
-#include <optional>
-#include <string>
-#include <vector>
+#include <thread>
 
-namespace {
-
-// Sets variables for the life of the object and restores the old values afterwards.
-class ScopedEnvironment {
- public:
-  ScopedEnvironment(std::initializer_list<std::pair<const char*, const char*>> values) {
-    for (const auto& [name, value] : values) {
-      const char* old = std::getenv(name);
-      saved_.push_back({name, old ? std::optional<std::string>(old) : std::nullopt});
-      if (value) {
-        setenv(name, value, 1);
-      } else {
-        unsetenv(name);
-      }
-    }
-  }
-  ~ScopedEnvironment() {
-    for (const auto& [name, value] : saved_) {
-      if (value) {
-        setenv(name.c_str(), value->c_str(), 1);
-      } else {
-        unsetenv(name.c_str());
-      }
-    }
-  }
-
- private:
-  std::vector<std::pair<std::string, std::optional<std::string>>> saved_;
-};
-
-}  // namespace
+#include "scoped_env.h"
 
 TEST(Language, LocaleNamesMapToWindowsLanguages) {
   struct Row {
@@ -98,10 +66,23 @@ TEST(Language, EnvironmentDecidesTheUserInterfaceLanguage) {
   };
   for (const Row& row : rows) {
     SCOPED_TRACE(row.name);
-    ScopedEnvironment env{{"TAVLO_PLATFORM_LANGID", row.langId},
-                          {"LC_ALL", row.lcAll},
-                          {"LC_MESSAGES", row.lcMessages},
-                          {"LANG", row.lang}};
+    const ScopedEnv env[] = {{"TAVLO_PLATFORM_LANGID", row.langId},
+                             {"LC_ALL", row.lcAll},
+                             {"LC_MESSAGES", row.lcMessages},
+                             {"LANG", row.lang}};
     EXPECT_EQ(win32::GetUserDefaultUILanguage(), row.expected);
   }
+}
+
+TEST(Language, ThreadUILanguageIsPerThreadAndFallsBackToTheUserDefault) {
+  ScopedEnv userLanguage("TAVLO_PLATFORM_LANGID", "0x0411");  // Japanese
+  EXPECT_EQ(win32::GetThreadUILanguage(), 0x0411);
+  EXPECT_EQ(win32::SetThreadUILanguage(0x040C), 0x040C);
+  EXPECT_EQ(win32::GetThreadUILanguage(), 0x040C);
+  LANGID otherThread = 0;
+  std::thread([&] { otherThread = win32::GetThreadUILanguage(); }).join();
+  EXPECT_EQ(otherThread, 0x0411) << "another thread keeps the default";
+  EXPECT_EQ(win32::SetThreadUILanguage(0), 0x0411) << "0 returns to the default";
+  ScopedEnv german("TAVLO_PLATFORM_LANGID", "0x0407");
+  EXPECT_EQ(win32::GetThreadUILanguage(), 0x0407) << "the default is read anew";
 }

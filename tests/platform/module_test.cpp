@@ -62,7 +62,7 @@ HMODULE NotAModule() {
 TEST(Module, LoadsAreCountedUntilTheLastFree) {
   ASSERT_TRUE(fs::exists(kProbe)) << "the test module is built next to the test program";
   ASSERT_FALSE(IsLoaded(kProbe));
-  HMODULE first = LoadLibraryW(u"Riched20.dll");
+  HMODULE first = LoadLibraryExW(u"Riched20.dll", nullptr, 0);  // without flags: LoadLibraryW
   ASSERT_NE(first, nullptr) << GetLastError();
   // Names match without regard to case; a name without extension gets ".dll".
   EXPECT_EQ(LoadLibraryW(u"RICHED20"), first);
@@ -86,6 +86,8 @@ TEST(Module, LoadsAreCountedUntilTheLastFree) {
 }
 
 TEST(Module, ReportsModulesThatCannotBeLoaded) {
+  EXPECT_EQ(LoadLibraryExW(u"Riched20.dll", nullptr, 0x2), nullptr) << "LoadLibraryExW takes no flags";
+  EXPECT_EQ(GetLastError(), ERROR_INVALID_PARAMETER);
   vyn::test::TempDir dir;
   const std::u16string broken = dir.Write("Broken.dll", "not a shared object");
   struct Row {

@@ -7,8 +7,8 @@
 #include <cstdint>
 #include <string>
 
+#include "codepage_test_support.h"
 #include "support/process_code_pages.h"
-#include "win32/codepage.h"
 #include "win32/text_unicode.h"
 
 namespace {
@@ -24,13 +24,7 @@ std::string Utf16(const std::u16string& text, bool bigEndian = false) {
   return bytes;
 }
 
-std::string Narrow(UINT codepage, const std::u16string& text) {
-  const int n = static_cast<int>(text.size());
-  std::string out(static_cast<std::size_t>(n) * 4, '\0');
-  out.resize(static_cast<std::size_t>(
-      WideCharToMultiByte(codepage, 0, text.data(), n, out.data(), static_cast<int>(out.size()), nullptr, nullptr)));
-  return out;
-}
+std::string Narrow(UINT codepage, const std::u16string& text) { return codepage_test::Encode(codepage, text); }
 
 // The tests of mask that bytes passes.
 INT Passed(const std::string& bytes, INT mask) {

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <ostream>
 #include <vector>
 
 #include "vynutil/char.h"
@@ -19,7 +20,10 @@ struct Step {
   std::size_t offset;  // units from the start
   std::size_t length;  // CharLength
   unsigned int code;   // *it
+  bool operator==(const Step&) const = default;
 };
+
+void PrintTo(const Step& s, std::ostream* os) { *os << "{" << s.offset << ", " << s.length << ", " << s.code << "}"; }
 
 // Walks text with prefix ++ to the terminator and records every step.
 template <class T>
@@ -32,21 +36,12 @@ std::vector<Step> Walk(T* text) {
   return steps;
 }
 
-void ExpectSteps(const std::vector<Step>& got, const std::vector<Step>& expected) {
-  ASSERT_EQ(got.size(), expected.size());
-  for (std::size_t i = 0; i < got.size(); ++i) {
-    EXPECT_EQ(got[i].offset, expected[i].offset) << "step " << i;
-    EXPECT_EQ(got[i].length, expected[i].length) << "step " << i;
-    EXPECT_EQ(got[i].code, expected[i].code) << "step " << i;
-  }
-}
-
 }  // namespace
 
 TEST(CharIterator, WideTextWithSurrogatePairs) {
   const MCHAR text[] = u"x\U0001F600a\U00010400";
   // A pair takes two units and reads as '?' from its lead unit alone.
-  ExpectSteps(Walk(text), {{0, 1, 'x'}, {1, 2, '?'}, {3, 1, 'a'}, {4, 2, '?'}});
+  EXPECT_EQ(Walk(text), (std::vector<Step>{{0, 1, 'x'}, {1, 2, '?'}, {3, 1, 'a'}, {4, 2, '?'}}));
 
   CharIterator<const MCHAR> it(text + 1);
   EXPECT_EQ(it.CharLength(), 2u);
@@ -61,14 +56,14 @@ TEST(CharIterator, WideTextWithSurrogatePairs) {
 
   // A lone trail surrogate is a character of its own, read as its value.
   const MCHAR trail[] = {0xDC00, u'b', 0};
-  ExpectSteps(Walk(trail), {{0, 1, 0xDC00}, {1, 1, 'b'}});
+  EXPECT_EQ(Walk(trail), (std::vector<Step>{{0, 1, 0xDC00}, {1, 1, 'b'}}));
 }
 
 TEST(CharIterator, NarrowDoubleByteText) {
   const ProcessCodePages japanese(932, 932);
   // Shift-JIS: "A", U+3042 (82 A0), U+FF71 half-width katakana (B1), U+4E00 (88 EA), "z".
   const char text[] = "A\x82\xA0\xB1\x88\xEAz";
-  ExpectSteps(Walk(text), {{0, 1, 'A'}, {1, 2, '?'}, {3, 1, 0xFF71}, {4, 2, '?'}, {6, 1, 'z'}});
+  EXPECT_EQ(Walk(text), (std::vector<Step>{{0, 1, 'A'}, {1, 2, '?'}, {3, 1, 0xFF71}, {4, 2, '?'}, {6, 1, 'z'}}));
 
   CharIterator<const char> it(text);
   it += 2;
@@ -78,12 +73,12 @@ TEST(CharIterator, NarrowDoubleByteText) {
 
 TEST(CharIterator, SingleByteAndUtf8ActiveCodePages) {
   const char text[] = "a\xE9\x80";  // 1252: a, U+00E9, U+20AC
-  ExpectSteps(Walk(text), {{0, 1, 'a'}, {1, 1, 0xE9}, {2, 1, 0x20AC}});
+  EXPECT_EQ(Walk(text), (std::vector<Step>{{0, 1, 'a'}, {1, 1, 0xE9}, {2, 1, 0x20AC}}));
 
   // A UTF-8 process has no double-byte lead bytes: a unit a step, every byte of a sequence '?'.
   const ProcessCodePages utf8(CP_UTF8, CP_UTF8);
   const char e[] = "\xC3\xA9" "b";
-  ExpectSteps(Walk(e), {{0, 1, '?'}, {1, 1, '?'}, {2, 1, 'b'}});
+  EXPECT_EQ(Walk(e), (std::vector<Step>{{0, 1, '?'}, {1, 1, '?'}, {2, 1, 'b'}}));
 }
 
 TEST(CharIterator, NeverPastTheTerminator) {

@@ -106,44 +106,8 @@ TYPED_TEST(StrEdit, SubstrAndRemove) {
   EXPECT_EQ(text.AllocatedChars(), 21u) << "a run is taken out into a block of the old capacity";
 }
 
-TYPED_TEST(StrEdit, ReplaceRows) {
-  struct Row {
-    const char* name;
-    const char* text;
-    const char* find;
-    const char* by;
-    bool firstOnly;
-    std::size_t start;
-    std::size_t count;
-    const char* expected;
-  };
-  const Row rows[] = {
-      {"every occurrence", "aXa", "a", "bb", false, 0, 2, "bbXbb"},
-      {"first only", "aXa", "a", "bb", true, 0, 1, "bbXa"},
-      {"occurrences do not overlap", "aaaa", "aa", "a", false, 0, 2, "aa"},
-      {"start at the length", "abc", "c", "x", false, 3, 0, "abc"},
-      {"empty find", "abc", "", "x", false, 0, 0, "abc"},
-      {"null find", "abc", nullptr, "x", false, 0, 0, "abc"},
-      {"null replaceBy", "abc", "b", nullptr, false, 0, 0, "abc"},
-      {"empty text", "", "a", "b", false, 0, 0, ""},
-  };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.name);
-    TypeParam text = FromText<TypeParam>(row.text);
-    EXPECT_EQ(text.Replace(Arg<TypeParam>(row.find).units, Arg<TypeParam>(row.by).units, row.firstOnly, row.start),
-              row.count);
-    EXPECT_EQ(TextOf(text), row.expected);
-  }
-  // The replacement may come from the string's own text, which the replacing rewrites.
-  TypeParam grow = FromText<TypeParam>("abcabc");
-  EXPECT_EQ(grow.Replace(FromText<TypeParam>("b").data(), grow.data() + 3), 2u);
-  EXPECT_EQ(TextOf(grow), "aabccaabcc");
-  TypeParam shrink = FromText<TypeParam>("xxabab");
-  shrink.dataForWrite(10);
-  EXPECT_EQ(shrink.Replace(FromText<TypeParam>("ab").data(), shrink.data() + 5), 2u);
-  EXPECT_EQ(TextOf(shrink), "xxbb");
-}
-
+// Replace against replacing one occurrence at a time on random texts, and the inputs that text
+// cannot give: nothing to find or to replace by, and a replacement from the string's own text.
 TYPED_TEST(StrEdit, ReplaceAgreesWithReplacingOneAtATime) {
   std::mt19937 random(20240611);
   const auto randomText = [&](std::size_t maxLength) {
@@ -168,6 +132,19 @@ TYPED_TEST(StrEdit, ReplaceAgreesWithReplacingOneAtATime) {
     EXPECT_EQ(TextOf(text), expected);
     EXPECT_EQ(TextOf(copy), original);
   }
+  for (const auto& [find, by] : {std::pair<const char*, const char*>{"", "x"}, {nullptr, "x"}, {"b", nullptr}}) {
+    TypeParam text = FromText<TypeParam>("abc");
+    EXPECT_EQ(text.Replace(Arg<TypeParam>(find).units, Arg<TypeParam>(by).units), 0u);
+    EXPECT_EQ(TextOf(text), "abc");
+  }
+  // The replacement may come from the string's own text, which the replacing rewrites.
+  TypeParam grow = FromText<TypeParam>("abcabc");
+  EXPECT_EQ(grow.Replace(FromText<TypeParam>("b").data(), grow.data() + 3), 2u);
+  EXPECT_EQ(TextOf(grow), "aabccaabcc");
+  TypeParam shrink = FromText<TypeParam>("xxabab");
+  shrink.dataForWrite(10);
+  EXPECT_EQ(shrink.Replace(FromText<TypeParam>("ab").data(), shrink.data() + 5), 2u);
+  EXPECT_EQ(TextOf(shrink), "xxbb");
 }
 
 TYPED_TEST(StrCase, AsciiAndSharing) {

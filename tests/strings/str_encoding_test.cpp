@@ -32,13 +32,12 @@ TEST(StrEncoding, EnglishProcessUsesTheActiveCodePage) {
 
 TEST(StrEncoding, MakersTakeTheClassFormOfTheNewBlock) {
   const unsigned int utf32[] = {'a', 0x1F600, 0};
-  struct Row {
+  const struct {
     const char* name;
     WStr made;
     std::u16string expected;
     UINT primary;
-  };
-  const Row rows[] = {
+  } rows[] = {
       {"FromCP 1251", WStr::FromCP(1251, "\xC0\xE1"), u"\u0410\u0431", 1251},  // cp1251: А б
       {"FromACP", WStr::FromACP("\x80"), u"\u20AC", 1252},                     // cp1252 0x80: €
       {"FromUTF8 with length", WStr::FromUTF8("\xC3\xA9xyz", 3), u"\u00E9x", CP_UTF8},
@@ -47,14 +46,13 @@ TEST(StrEncoding, MakersTakeTheClassFormOfTheNewBlock) {
       {"FromUTF32", WStr::FromUTF32(utf32), u"a\U0001F600", CP_UTF32},
       {"FromCP with a zero inside", WStr::FromCP(1252, "ab\0cd", 5), u"ab", 1252},
   };
-  for (const Row& row : rows) {
+  for (const auto& row : rows) {
     SCOPED_TRACE(row.name);
     EXPECT_EQ(std::u16string(row.made.data()), row.expected);
     EXPECT_EQ(row.made.ToVynString().PrimaryCP(), row.primary);
   }
-  EXPECT_TRUE(WStr::FromUTF8(nullptr).ToVynString().IsNull());
-  EXPECT_TRUE(CStr::FromUTF16(nullptr).ToVynString().IsNull());
-  EXPECT_TRUE(UTF8Str::FromACP(nullptr).ToVynString().IsNull());
+  EXPECT_TRUE(WStr::FromUTF8(nullptr).ToVynString().IsNull() && CStr::FromUTF16(nullptr).ToVynString().IsNull() &&
+              UTF8Str::FromACP(nullptr).ToVynString().IsNull());
   EXPECT_EQ(Bytes(CStr::FromUTF8("\xE2\x82\xAC").data()), "\x80");
   EXPECT_EQ(Bytes(UTF8Str::FromCP(1252, "\x80").data()), "\xE2\x82\xAC");
   EXPECT_EQ(Bytes(UTF8Str::FromCStr(CStr("\x80")).data()), "\xE2\x82\xAC");
@@ -70,9 +68,7 @@ TEST(StrEncoding, SurrogatePairsSurviveEveryForm) {
   EXPECT_EQ(u.Length(), 5);
   EXPECT_EQ(u.ByteCount(), 5);
   const unsigned int* utf32 = w.ToUTF32();
-  EXPECT_EQ(utf32[0], 0x1F600u);
-  EXPECT_EQ(utf32[1], unsigned('x'));
-  EXPECT_EQ(utf32[2], 0u);
+  EXPECT_TRUE(utf32[0] == 0x1F600u && utf32[1] == 'x' && utf32[2] == 0u);
   EXPECT_EQ(UTF8Str::FromUTF8("\xF0\x9F\x98\x80x").ToWStr(), w);
   EXPECT_EQ(QString(w), QString::fromUtf8("\xF0\x9F\x98\x80x"));
   EXPECT_EQ(WStr(QString::fromUtf8("\xF0\x9F\x98\x80x")), w);
@@ -97,12 +93,9 @@ TEST(StrEncoding, QStringRoundTrips) {
   EXPECT_EQ(Bytes(CStr(QString::fromUtf8("\xE6\x97\xA5")).data()), "?");
 
   // Made from a QString the string is never null; null ones give empty QStrings.
-  EXPECT_FALSE(WStr(QString()).ToVynString().IsNull());
-  EXPECT_FALSE(CStr(QString()).ToVynString().IsNull());
-  EXPECT_FALSE(UTF8Str(QString()).ToVynString().IsNull());
-  EXPECT_TRUE(QString(WStr()).isEmpty());
-  EXPECT_TRUE(QString(CStr()).isEmpty());
-  EXPECT_TRUE(QString(UTF8Str()).isEmpty());
+  EXPECT_FALSE(WStr(QString()).ToVynString().IsNull() || CStr(QString()).ToVynString().IsNull() ||
+               UTF8Str(QString()).ToVynString().IsNull());
+  EXPECT_TRUE(QString(WStr()).isEmpty() && QString(CStr()).isEmpty() && QString(UTF8Str()).isEmpty());
 
   WStr assigned;
   assigned = text;

@@ -31,7 +31,6 @@ const LanguageRow kRows[] = {
     {"ChineseTraditional", {{"TAVLO_PLATFORM_LANGID", "1028"}}, 936},  // primary language 4
     {"Korean", {{"TAVLO_PLATFORM_LANGID", "0x0412"}}, 949},
     {"German", {{"TAVLO_PLATFORM_LANGID", "0x0407"}}, CP_ACP},
-    {"EnglishUS", {{"TAVLO_PLATFORM_LANGID", "0x0409"}}, CP_ACP},
     {"JapaneseFromLang",
      {{"TAVLO_PLATFORM_LANGID", ""}, {"LC_ALL", ""}, {"LC_MESSAGES", ""}, {"LANG", "ja_JP.UTF-8"}},
      932},
