@@ -13,10 +13,10 @@
 #include <string>
 
 #include "win32/sync.h"
+#include "allocation_counter.h"
 
 namespace {
 
-std::atomic<long> allocations{0};
 
 std::u16string Name(const char* stem) {
   const std::string name = stem + std::to_string(getpid());
@@ -37,13 +37,13 @@ void RoundTripOfOpenName(benchmark::State& state) {
 
 void WaitAndRelease(benchmark::State& state) {
   const HANDLE mutex = win32::CreateMutexW(nullptr, FALSE, Name("Vyn.Bench.Wait.").c_str());
-  const long before = allocations.load();
+  const long before = bench::allocations.load();
   for (auto _ : state) {
     win32::WaitForSingleObject(mutex, INFINITE);
     win32::ReleaseMutex(mutex);
   }
   state.counters["allocations/op"] =
-      static_cast<double>(allocations.load() - before) / static_cast<double>(state.iterations());
+      static_cast<double>(bench::allocations.load() - before) / static_cast<double>(state.iterations());
   win32::CloseHandle(mutex);
 }
 
@@ -66,15 +66,6 @@ void PthreadLockUnlock(benchmark::State& state) {
 }
 
 }  // namespace
-
-// Counts every allocation of the process, the library's included.
-void* operator new(std::size_t size) {
-  allocations.fetch_add(1, std::memory_order_relaxed);
-  if (void* p = std::malloc(size ? size : 1)) return p;
-  throw std::bad_alloc();
-}
-void operator delete(void* p) noexcept { std::free(p); }
-void operator delete(void* p, std::size_t) noexcept { std::free(p); }
 
 BENCHMARK(RoundTripOfOpenName);
 BENCHMARK(WaitAndRelease);

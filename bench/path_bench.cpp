@@ -11,10 +11,10 @@
 
 #include "vynutil/path.h"
 #include "vynutil/symbol_manager.h"
+#include "allocation_counter.h"
 
 namespace {
 
-std::atomic<long> allocations{0};
 
 std::vector<std::u16string> TypicalPaths(int count) {
   static const char16_t* const shapes[] = {
@@ -49,23 +49,14 @@ void ResolvedPathCacheHit(benchmark::State& state) {
   ISymbolManager::GetInstance()->RegisterSymbol(u"ProjectFolder", new StaticSymbolResolver(u"D:\\Work\\Proj"));
   VynSDK::Util::Path path(u"scenes\\..\\maps\\Texture.png");
   path.GetResolvedAbsolutePath();
-  const long before = allocations.load();
+  const long before = bench::allocations.load();
   for (auto _ : state) benchmark::DoNotOptimize(&path.GetResolvedAbsolutePath());
   state.counters["allocations/hit"] =
-      static_cast<double>(allocations.load() - before) / static_cast<double>(state.iterations());
+      static_cast<double>(bench::allocations.load() - before) / static_cast<double>(state.iterations());
   ISymbolManager::GetInstance()->UnregisterSymbol(u"ProjectFolder");
 }
 
 }  // namespace
-
-// Counts every allocation of the process, the library's included.
-void* operator new(std::size_t size) {
-  allocations.fetch_add(1, std::memory_order_relaxed);
-  if (void* p = std::malloc(size ? size : 1)) return p;
-  throw std::bad_alloc();
-}
-void operator delete(void* p) noexcept { std::free(p); }
-void operator delete(void* p, std::size_t) noexcept { std::free(p); }
 
 BENCHMARK(NormalizeMillionPaths)->Unit(benchmark::kMillisecond);
 BENCHMARK(ResolvedPathCacheHit);
