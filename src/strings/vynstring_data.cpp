@@ -278,14 +278,9 @@ VynStringData* FromUnits(UINT encoding, const void* s, std::size_t len) {
   return data;
 }
 
-void AddRef(VynStringData* data) noexcept {
-  // The only holder is the caller: nobody else can change the count at the same time.
-  if (data->refs.load(std::memory_order_relaxed) == 1) {
-    data->refs.store(2, std::memory_order_relaxed);
-    return;
-  }
-  data->refs.fetch_add(1, std::memory_order_relaxed);
-}
+// Always atomic: a string held once may still be copied by several threads at the same time
+// (each reads the one holder), so a count of 1 does not mean the caller is alone.
+void AddRef(VynStringData* data) noexcept { data->refs.fetch_add(1, std::memory_order_relaxed); }
 
 std::uint32_t Release(VynStringData* data) noexcept {
   // The only holder needs no atomic read-modify-write: nobody else can add a reference.
