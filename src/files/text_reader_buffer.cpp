@@ -86,6 +86,13 @@ void Reader::Engine::AppendBytes(const Reader& r, const void* data, std::size_t 
   if (written != bytes) throw std::bad_alloc();
 }
 
+void Reader::Engine::ReplaceFrom(const Reader& r, std::size_t start, const void* text, std::size_t bytes,
+                                 const std::vector<std::uint8_t>& stray) {
+  r.m_buffer->Truncate(start);
+  AppendBytes(r, text, bytes);
+  AppendBytes(r, stray.data(), stray.size());
+}
+
 std::size_t Reader::Engine::ReadSourcePiece(const Reader& r, std::size_t request) {
   BinaryStreamMemory& buffer = *r.m_buffer;
   const std::size_t length = buffer.Length();
@@ -153,6 +160,16 @@ std::vector<Unit> TakeUnits(BinaryStreamMemory& buffer, std::size_t start, std::
   return units;
 }
 
+// Runs work with a value of the buffer's unit type: 16-bit units for UTF-16, else bytes.
+template <typename Work>
+void ForEachUnitType(std::size_t unitSize, Work work) {
+  if (unitSize == 2) {
+    work(std::uint16_t());
+  } else {
+    work(std::uint8_t());
+  }
+}
+
 }  // namespace
 
 void Reader::Engine::FilterBlock(const Reader& r, std::size_t start, bool final) {
@@ -174,15 +191,9 @@ void Reader::Engine::FilterBlock(const Reader& r, std::size_t start, bool final)
     detail::TranslateLineEnds(block, r.m_mode, pending, last);
     r.m_pendingCR = pending.cr;
     r.m_pendingLF = pending.lf;
-    r.m_buffer->Truncate(start);
-    AppendBytes(r, block.data(), block.size() * sizeof(Unit));
-    AppendBytes(r, stray.data(), stray.size());
+    ReplaceFrom(r, start, block.data(), block.size() * sizeof(Unit), stray);
   };
-  if (UnitSize(r) == 2) {
-    filter(std::uint16_t());
-  } else {
-    filter(std::uint8_t());
-  }
+  ForEachUnitType(UnitSize(r), filter);
 }
 
 std::size_t Reader::Engine::Fill(const Reader& r, std::size_t request) {
@@ -269,15 +280,9 @@ void Reader::Engine::FilterUnread(const Reader& r) {
     } else if (block.size() == before) {
       return;
     }
-    r.m_buffer->Truncate(start);
-    AppendBytes(r, block.data(), block.size() * sizeof(Unit));
-    AppendBytes(r, stray.data(), stray.size());
+    ReplaceFrom(r, start, block.data(), block.size() * sizeof(Unit), stray);
   };
-  if (UnitSize(r) == 2) {
-    filter(std::uint16_t());
-  } else {
-    filter(std::uint8_t());
-  }
+  ForEachUnitType(UnitSize(r), filter);
 }
 
 std::size_t Reader::Engine::NextChar(const Reader& r, bool& complete) {

@@ -10,6 +10,7 @@
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
+#include <vector>
 
 #include "files/text_reader_codec.h"
 #include "vynutil/text_reader.h"
@@ -93,6 +94,9 @@ struct Reader::Engine {
   static void SwapUnits(const Reader& r, std::size_t from);
   static void FilterBlock(const Reader& r, std::size_t start, bool final);
   static void AppendBytes(const Reader& r, const void* data, std::size_t bytes);
+  // Replaces the buffer from start on by bytes bytes of text and then the stray bytes.
+  static void ReplaceFrom(const Reader& r, std::size_t start, const void* text, std::size_t bytes,
+                          const std::vector<std::uint8_t>& stray);
 };
 
 }  // namespace VynSDK::Util::TextFile
